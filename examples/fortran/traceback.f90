@@ -33,8 +33,10 @@ contains
     character(len=:), allocatable :: s
     character(kind=c_char), pointer :: chars(:)
     integer :: n
-    s = ""
-    if (.not. c_associated(p)) return
+    if (.not. c_associated(p)) then
+      s = ""
+      return
+    end if
     call c_f_pointer(p, chars, [1000])
     n = 0
     do while (chars(n + 1) /= achar(0))
