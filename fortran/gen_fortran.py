@@ -6,11 +6,13 @@ Usage: gen_fortran.py --module NAME --output FILE [--macro M]... HEADER...
 Reads the declarations that start with one of the export marks (default: every ORVQ7_*API),
 with their continuation lines up to the closing ';', and writes one interface per routine:
   int32_t, int       integer(c_int)        int64_t  integer(c_int64_t)
-  double             real(c_double)        size_t   integer(c_size_t)
+  int16_t, int8_t    integer(c_int16_t), integer(c_int8_t) (unsigned: the same kinds)
+  double, float      real(c_double), real(c_float)          size_t   integer(c_size_t)
   T*                 by reference; a "const" pointee gives intent(in), else intent(inout)
   T  (no pointer)    value
   char*              character(kind=c_char) :: name(*)
   void*              type(c_ptr), value    T**      type(c_ptr) (by reference)
+  struct S*          type(c_ptr), value (an opaque record: pass its address)
   function pointer   type(c_funptr), value (pass c_funloc of a bind(C) procedure)
   enum type          integer(c_int)
 A pointer to a number is an array (*) when the routine's block lists the argument with a
@@ -23,13 +25,17 @@ import argparse
 import re
 import sys
 
+# Fortran has no unsigned integers: an unsigned type maps to the signed kind of its size.
 C_INT_TYPES = {"int32_t": "integer(c_int)", "int": "integer(c_int)",
-               "int64_t": "integer(c_int64_t)", "size_t": "integer(c_size_t)",
-               "double": "real(c_double)"}
-KIND_OF = {"integer(c_int)": "c_int", "integer(c_int64_t)": "c_int64_t",
-           "integer(c_size_t)": "c_size_t", "real(c_double)": "c_double"}
+               "uint32_t": "integer(c_int)", "int64_t": "integer(c_int64_t)",
+               "uint64_t": "integer(c_int64_t)", "int16_t": "integer(c_int16_t)",
+               "uint16_t": "integer(c_int16_t)", "int8_t": "integer(c_int8_t)",
+               "uint8_t": "integer(c_int8_t)", "size_t": "integer(c_size_t)",
+               "double": "real(c_double)", "float": "real(c_float)"}
+C_KINDS = ["c_int", "c_int8_t", "c_int16_t", "c_int64_t", "c_size_t", "c_double", "c_float",
+           "c_char", "c_ptr", "c_funptr"]
 C_KEYWORDS = {"const", "volatile", "restrict", "struct", "enum", "unsigned", "signed",
-              "void", "char", "int", "double", "int32_t", "int64_t", "size_t"}
+              "void", "char", "int", "double", "float"} | set(C_INT_TYPES)
 MAX_LINE = 100
 
 
@@ -68,6 +74,8 @@ class Header:
         self.enum_types |= set(re.findall(r"}\s*([A-Za-z_]\w*)\s*;",
                                           " ".join(re.findall(r"typedef\s+enum[^;]*;",
                                                               strip_comments(self.text), re.S))))
+        self.struct_types = set(re.findall(r"\bstruct\s+([A-Za-z_]\w*)",
+                                           strip_comments(self.text)))
         self.funptr_types = set(re.findall(r"typedef[^;(]*\(\s*\*\s*([A-Za-z_]\w*)\s*\)",
                                            strip_comments(self.text)))
         self.constants = self._constants()
@@ -181,6 +189,9 @@ class Header:
             return {"name": name, "decl": "type(c_funptr), value", "c": arg}
         if base in self.enum_types:
             base = "int"
+        if base in self.struct_types and stars == 1:
+            # An opaque record of the library's own: its address, as from c_loc.
+            return {"name": name, "decl": "type(c_ptr), value", "c": arg}
         if stars >= 2:
             return {"name": name, "decl": "type(c_ptr), " + intent, "c": arg}
         if base == "void":
@@ -292,11 +303,10 @@ def emit(module, headers):
     for h in headers:
         out.append("!   " + h.path)
     out += ["module %s" % module,
-            "  use, intrinsic :: iso_c_binding, only: c_int, c_int64_t, c_size_t, c_double, &",
-            "                                        c_char, c_ptr, c_funptr",
+            "  use, intrinsic :: iso_c_binding, only: %s, &" % ", ".join(C_KINDS[:7]),
+            "                                        %s" % ", ".join(C_KINDS[7:]),
             "  implicit none", ""]
-    taken = {"c_int", "c_int64_t", "c_size_t", "c_double", "c_char", "c_ptr", "c_funptr",
-             module.lower()}
+    taken = set(C_KINDS) | {module.lower()}
     seen_constants = set()
     for h in headers:
         for name, value in h.constants:
@@ -338,11 +348,10 @@ def interface(r):
                 ') bind(C, name="%s")' % r["name"], 4)
     kinds = set()
     for a in r["args"]:
-        kinds |= set(re.findall(r"\((c_\w+)\)|type\((c_\w+)\)|kind=(c_\w+)", a["decl"])[0]) \
-            if re.search(r"c_\w+", a["decl"]) else set()
+        kinds |= set(re.findall(r"\bc_\w+", a["decl"]))
     if r["result"]:
-        kinds |= set(re.findall(r"c_\w+", r["result"]))
-    kinds = sorted(k for k in kinds if k)
+        kinds |= set(re.findall(r"\bc_\w+", r["result"]))
+    kinds = sorted(kinds)
     if kinds:
         out.append("      import :: " + ", ".join(kinds))
     for a, n in zip(r["args"], argnames):

@@ -2,5 +2,6 @@
  * an error instead of guessing an interface. */
 #include <stdint.h>
 #define ORVQ7_FIX_API
-/** fxbad -- single precision is not part of the calling convention. */
-ORVQ7_FIX_API float fxbad(const float* x);
+struct Orvq7FixPair { double a, b; };
+/** fxbad -- a record by value is not part of the calling convention. */
+ORVQ7_FIX_API int32_t fxbad(const int32_t* n, struct Orvq7FixPair pair);

@@ -59,4 +59,12 @@ int32_t fxcall(int32_t (*f)(const double* x, double* fx), const double* x, doubl
   return r + 10 * g(y, gy);
 }
 
+struct Orvq7FixRecord {
+  int32_t count;
+};
+
+int32_t fxhdr(const int16_t* h, const struct Orvq7FixRecord* rec) {
+  return h[0] + h[1] + rec->count;
+}
+
 void fxclear(void) { s_last[0] = '\0'; }

@@ -62,6 +62,12 @@ ORVQ7_FIX_API int32_t fxfill(void* area, const int32_t* count, double value);
 ORVQ7_FIX_API int32_t fxcall(int32_t (*f)(const double* x, double* fx), const double* x,
                              double* fx, Orvq7FixEval g, const double* y, double* gy);
 
+struct Orvq7FixRecord;
+/** fxhdr -- h(1) + h(2) + the record's count (an opaque record, passed by its address).
+ *   h    in  int16(2)
+ *   rec  in  record */
+ORVQ7_FIX_API int32_t fxhdr(const int16_t* h, const struct Orvq7FixRecord* rec);
+
 /** fxclear -- forgets the last name. */
 ORVQ7_FIX_API void fxclear(void);
 

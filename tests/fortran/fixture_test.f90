@@ -22,7 +22,7 @@ contains
 end module fixture_callbacks
 
 program fixture_test
-  use, intrinsic :: iso_c_binding, only: c_int, c_int64_t, c_double, c_char, c_ptr, &
+  use, intrinsic :: iso_c_binding, only: c_int, c_int16_t, c_int64_t, c_double, c_char, &
                                          c_loc, c_funloc, c_f_pointer
   use orvq7_fixture
   use fixture_callbacks
@@ -36,6 +36,7 @@ program fixture_test
   integer(c_int64_t) :: k
   character(kind=c_char, len=6), target :: word
   character(kind=c_char), pointer :: chars(:)
+  integer(c_int), target :: record(1) = [100]
 
   ! Constants from #define and from both enums.
   call expect(ORVQ7FIX_LIMIT == 7 .and. ORVQ7FIX_BAD == 4712 .and. ORVQ7FIX_OK == 0, 1)
@@ -84,6 +85,8 @@ program fixture_test
   call expect(fxcall(c_funloc(product2), [3.0_c_double, 4.0_c_double], fx, &
                      c_funloc(negate), 2.0_c_double, gy) == 13, 15)
   call expect(fx == 12.0_c_double .and. gy == -2.0_c_double, 16)
+  ! Two-byte integers, and a record by its address.
+  call expect(fxhdr([7_c_int16_t, -2_c_int16_t], c_loc(record)) == 105, 17)
   print '(a)', "fixture: every mapping as declared"
 
 contains
