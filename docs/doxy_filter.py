@@ -12,7 +12,8 @@ manual shows:
     first of them;
   - a section banner (a comment framed by rules of '=' or '-') becomes a named member group,
     so the manual lists the routines under the header's own sections;
-  - a plain file comment `/* dir/file.h -- title ...` becomes the file's documentation.
+  - a plain file comment `/* dir/file.h -- title ...` becomes the file's documentation, and
+    a plain comment right above a typedef or a declaration documents it as a block does.
 Everything else goes through unchanged. Usage: doxy_filter.py HEADER (writes to stdout).
 """
 import re
@@ -130,7 +131,8 @@ def filter_header(source):
             out.append("/** @} */\n")
             group_open = False
 
-    for kind, text in split_items(source):
+    items = split_items(source)
+    for index, (kind, text) in enumerate(items):
         if kind == "comment":
             if not seen_code and file_comment(text) is not None:
                 out.append(file_comment(text))
@@ -153,6 +155,11 @@ def filter_header(source):
                 continue
             if text.startswith("/**") and not text.startswith("/**<"):
                 documented = True
+            elif text.startswith("/*") and documents_next(items, index):
+                # A plain comment right above a declaration describes it.
+                out.append(routine_block(text))
+                documented = True
+                continue
             out.append(text)
             continue
         # Code: watch the declarations line by line.
@@ -183,6 +190,15 @@ def filter_header(source):
             out.append(line + ("\n" if k < len(lines) - 1 else ""))
     close_group()
     return "".join(out)
+
+
+def documents_next(items, index):
+    """True when the code right after comment `index` (no blank line between) is a typedef
+    or an exported declaration."""
+    if index + 1 >= len(items) or items[index + 1][0] != "code":
+        return False
+    m = re.match(r"[ \t]*\n[ \t]*(\S[^\n]*)", items[index + 1][1])
+    return bool(m) and (m.group(1).startswith("typedef ") or bool(DECLARATION.match(m.group(1))))
 
 
 def out_tail_is_adjacent(out):

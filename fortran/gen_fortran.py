@@ -47,39 +47,71 @@ def strip_comments(text):
     return re.sub(r"/\*.*?\*/|//[^\n]*", " ", text, flags=re.S)
 
 
+NAMES = r"([A-Za-z_]\w*(?:\s*,\s*(?:[A-Za-z_]\w*|\.\.\.))*)"
+
+
 def documented_shapes(block):
-    """Argument name -> True (array) / False (scalar) from a block's argument table."""
-    shapes = {}
+    """From a block's argument table: argument name -> True (array) or False (scalar), and
+    argument name -> routine for the entries `p, n  as for solmpr`. An entry is
+    `names  in|out|in/out|scratch  type ...`, one or several to a line (separated by ';')."""
+    shapes, refs = {}, {}
     for line in block.split("\n"):
-        line = re.sub(r"^\s*(/\*\*|\*)?", "", line)
-        m = re.match(r"^\s+([A-Za-z_]\w*(?:\s*,\s*[A-Za-z_]\w*)*)\s+"
-                     r"(in/out|inout|in|out|scratch|work)\s+(\S+)", line)
-        if not m:
-            continue
-        shaped = "(" in m.group(3) or m.group(3).rstrip(",") == "array"
-        for name in re.split(r"\s*,\s*", m.group(1)):
-            shapes.setdefault(name, shaped)
-    return shapes
+        line = re.sub(r"^\s*(/\*\*|\*(?!/))?", "", line)
+        for k, entry in enumerate(line.split(";")):
+            if k == 0 and not entry.startswith("  "):
+                break  # prose, not a table line
+            m = re.match(r"^\s*" + NAMES + r"\s+(in/out|inout|in|out|scratch|work)\s+(\S+)",
+                         entry)
+            if m:
+                shaped = "(" in m.group(3) or m.group(3).rstrip(",") == "array"
+                for name in re.split(r"\s*,\s*", m.group(1)):
+                    shapes.setdefault(name, shaped)
+                continue
+            m = re.match(r"^\s*" + NAMES + r"\s+as for\s+([A-Za-z_]\w*)", entry)
+            if m:
+                for name in re.split(r"\s*,\s*", m.group(1)):
+                    refs.setdefault(name, m.group(2))
+    return shapes, refs
+
+
+class Types:
+    """The enum, record and callback types declared in any of the headers (a header may use
+    a type that another one declares)."""
+
+    def __init__(self):
+        self.enum_types, self.struct_types, self.funptr_types = set(), set(), {}
+
+    def scan(self, text):
+        code = strip_comments(text)
+        self.enum_types |= set(re.findall(r"\benum\s+([A-Za-z_]\w*)", code))
+        for body in re.findall(r"typedef\s+enum[^;]*;", code, re.S):
+            self.enum_types |= set(re.findall(r"}\s*([A-Za-z_]\w*)\s*;", body))
+        self.struct_types |= set(re.findall(r"\bstruct\s+([A-Za-z_]\w*)", code))
+        for m in re.finditer(r"typedef\s+([^;(]*?)\(\s*\*\s*([A-Za-z_]\w*)\s*\)\s*(\([^;]*\))\s*;",
+                             code):
+            self.funptr_types[m.group(2)] = " ".join(
+                ("%s (*)%s" % (m.group(1).strip(), m.group(3))).split())
 
 
 class Header:
-    """The declarations, enum types, callback types and constants of one header."""
+    """The declarations and constants of one header."""
 
-    def __init__(self, path, macros):
+    def __init__(self, path, macros, types=None):
         with open(path, encoding="utf-8") as f:
             self.text = f.read()
         self.path = path
         self.macros = macros
-        self.enum_types = set(re.findall(r"\benum\s+([A-Za-z_]\w*)", self.text))
-        self.enum_types |= set(re.findall(r"}\s*([A-Za-z_]\w*)\s*;",
-                                          " ".join(re.findall(r"typedef\s+enum[^;]*;",
-                                                              strip_comments(self.text), re.S))))
-        self.struct_types = set(re.findall(r"\bstruct\s+([A-Za-z_]\w*)",
-                                           strip_comments(self.text)))
-        self.funptr_types = set(re.findall(r"typedef[^;(]*\(\s*\*\s*([A-Za-z_]\w*)\s*\)",
-                                           strip_comments(self.text)))
+        if types is None:
+            types = Types()
+            types.scan(self.text)
+        self.enum_types = types.enum_types
+        self.struct_types = types.struct_types
+        self.funptr_types = types.funptr_types
+
+    def parse(self):
         self.constants = self._constants()
         self.routines = self._routines()
+        return self
 
     def _constants(self):
         out = []
@@ -147,12 +179,12 @@ class Header:
         if not m:
             raise HeaderError("%s: cannot read the declaration '%s'" % (where, decl))
         ret, name, args_text = m.group(1).strip(), m.group(2), m.group(3).strip()
-        shapes = documented_shapes(block)
+        shapes, refs = documented_shapes(block)
         brief = lead_sentence(block)
         args = []
         if args_text and args_text != "void":
             for k, arg in enumerate(split_args(args_text)):
-                args.append(self._argument(arg, k + 1, shapes, where))
+                args.append(self._argument(arg, k + 1, shapes, refs, where))
         return {"name": name, "result": self._result(ret, where), "args": args,
                 "brief": brief, "decl": decl}
 
@@ -168,7 +200,7 @@ class Header:
             return "integer(c_int)"
         raise HeaderError("%s: no Fortran type for the result '%s'" % (where, ret))
 
-    def _argument(self, arg, position, shapes, where):
+    def _argument(self, arg, position, shapes, refs, where):
         fp = re.match(r"^.*\(\s*\*\s*([A-Za-z_]\w*)?\s*\)\s*\(.*\)$", arg)
         if fp:
             return {"name": fp.group(1) or "a%d" % position, "decl": "type(c_funptr), value",
@@ -184,9 +216,10 @@ class Header:
             stars += 1
         intent = "intent(in)" if const_pointee or stars == 0 else "intent(inout)"
         if base in self.funptr_types:
+            proto = "%s = %s" % (base, self.funptr_types[base])
             if stars:
-                return {"name": name, "decl": "type(c_funptr), " + intent, "c": arg}
-            return {"name": name, "decl": "type(c_funptr), value", "c": arg}
+                return {"name": name, "decl": "type(c_funptr), " + intent, "c": proto}
+            return {"name": name, "decl": "type(c_funptr), value", "c": proto}
         if base in self.enum_types:
             base = "int"
         if base in self.struct_types and stars == 1:
@@ -207,7 +240,8 @@ class Header:
             if stars == 0:
                 return {"name": name, "decl": ftype + ", value", "c": arg}
             dims = "(*)" if shapes.get(name, False) else ""
-            return {"name": name, "decl": "%s, %s" % (ftype, intent), "dims": dims, "c": arg}
+            return {"name": name, "decl": "%s, %s" % (ftype, intent), "dims": dims, "c": arg,
+                    "as_for": None if name in shapes else refs.get(name)}
         raise HeaderError("%s: no Fortran type for the argument '%s'" % (where, arg))
 
 
@@ -294,6 +328,20 @@ def wrap(prefix, items, suffix, indent, sep=", ", cont=None):
     return lines
 
 
+def resolve_references(headers):
+    """Gives an argument documented `as for <routine>` that routine's shape for it."""
+    by_name = {r["name"]: r for h in headers for r in h.routines}
+    for h in headers:
+        for r in h.routines:
+            for a in r["args"]:
+                other = by_name.get(a.get("as_for") or "")
+                if other is None:
+                    continue
+                for b in other["args"]:
+                    if b["name"] == a["name"] and b["decl"] == a["decl"] and "dims" in b:
+                        a["dims"] = b["dims"]
+
+
 def emit(module, headers):
     out = ["! %s.f90 -- Fortran interfaces to the routines of the C headers listed below." % module,
            "! Generated at build time from the headers; do not edit: edit the headers.",
@@ -303,9 +351,10 @@ def emit(module, headers):
     for h in headers:
         out.append("!   " + h.path)
     out += ["module %s" % module,
-            "  use, intrinsic :: iso_c_binding, only: %s, &" % ", ".join(C_KINDS[:7]),
-            "                                        %s" % ", ".join(C_KINDS[7:]),
+            "  use, intrinsic :: iso_c_binding, only: %s, &" % ", ".join(C_KINDS[:5]),
+            "                                        %s" % ", ".join(C_KINDS[5:]),
             "  implicit none", ""]
+    resolve_references(headers)
     taken = set(C_KINDS) | {module.lower()}
     seen_constants = set()
     for h in headers:
@@ -343,7 +392,8 @@ def interface(r):
         out += wrap("    ! ", r["brief"].split(" "), "", 4, sep=" ", cont="    ! ")
     for a in r["args"]:
         if a["decl"].startswith("type(c_funptr)"):
-            out.append("    ! %s: %s" % (a["name"], a["c"])[:MAX_LINE])
+            out += wrap("    ! %s: " % a["name"], a["c"].split(" "), "", 4, sep=" ",
+                        cont="    !   ")
     out += wrap("    %s %s(" % (kind, fname), argnames,
                 ') bind(C, name="%s")' % r["name"], 4)
     kinds = set()
@@ -370,7 +420,12 @@ def main(argv):
     p.add_argument("headers", nargs="+")
     args = p.parse_args(argv)
     try:
-        headers = [Header(h, args.macro) for h in args.headers]
+        types = Types()
+        headers = [Header(h, args.macro, types) for h in args.headers]
+        for h in headers:
+            types.scan(h.text)
+        for h in headers:
+            h.parse()
         text = emit(args.module, headers)
     except HeaderError as e:
         print("gen_fortran.py: " + str(e), file=sys.stderr)

@@ -17,6 +17,13 @@ int32_t fxsum(const int32_t* n, const double* v, double* total, int32_t* ierr) {
   return 0;
 }
 
+int32_t fxmean(const int32_t* n, const double* v, double* mean, int32_t* ierr) {
+  double total = 0.0;
+  if (fxsum(n, v, &total, ierr) == 1) return 1;
+  *mean = total / *n;
+  return 0;
+}
+
 void fxaxpy(const double* a, const double* x, double* y) {
   for (int i = 0; i < 3; ++i) y[i] = *a * x[i] + y[i];
 }

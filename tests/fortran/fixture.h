@@ -27,6 +27,11 @@ ORVQ7_FIX_API int32_t fxsum(const int32_t* n, const double* v,
                             double* total,
                             int32_t* ierr);
 
+/** fxmean -- mean of v(1..n); fails as fxsum does.
+ *   n, v  as for fxsum;  mean  out  real
+ *   ierr  out  int32 */
+ORVQ7_FIX_API int32_t fxmean(const int32_t* n, const double* v, double* mean, int32_t* ierr);
+
 /** fxaxpy -- y = a x + y on 3 components.
  *   a     in      real
  *   x, y  in/out  real(3)  x is read only; y is written */

@@ -49,6 +49,9 @@ program fixture_test
   call expect(fxsum(0_c_int, v, total, ierr) == 1 .and. ierr == 4712 &
               .and. total == -1.0_c_double, 3)
 
+  ! Shapes given by reference to another routine's block.
+  call expect(fxmean(4_c_int, v, total, ierr) == 0 .and. total == 1.5_c_double, 18)
+
   ! A subroutine; and a declaration sharing the block above it takes its shapes.
   call fxaxpy(2.0_c_double, x, y)
   call expect(all(y == [12.0_c_double, 24.0_c_double, 36.0_c_double]), 4)
