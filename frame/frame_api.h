@@ -1,7 +1,8 @@
-/* frame/frame_api.h -- calling convention, status codes and load-time items of OrvQ7Maths
+/** \file
+ * \brief Calling convention, status codes, version and load-time items of OrvQ7Maths
  * (public header; compiles as C11 and as C++).
  *
- * Calling convention of every exported routine
+ * **Calling convention of every exported routine**
  *   - Every argument is passed by reference, scalars included: int32_t* for integers,
  *     double* for reals, arrays as a pointer to their first element. "in" arguments are
  *     declared const and are never written.
@@ -18,11 +19,11 @@
  *     number of elements, and no pointer is null unless the routine's block says the
  *     argument is never read.
  *
- * State: routines that keep values between calls keep them per thread (one copy per
+ * **State**: routines that keep values between calls keep them per thread (one copy per
  * thread), so a thread sees exactly the persistence its blocks document and two threads
  * never see each other's values. Scratch that no later call reads lives on the stack.
  *
- * Platform services: the library calls the traceback (bftier), message (errmsg) and
+ * **Platform services**: the library calls the traceback (bftier), message (errmsg) and
  * workspace services (altes/detes, ...) of libOrvQ7System.so, reads the shared data areas
  * (toler, decale, dynar, ...) of libQ7SysCOMD.so and registers itself with
  * libOrvMathematics.so, only through their exported names, so a host can supply its own.
@@ -32,12 +33,26 @@
 
 #include <stdint.h>
 
+/** Version of the library these headers belong to (major, minor, patch). A new major
+ * version may change an exported routine's arguments or behaviour; minor versions add
+ * routines; patch versions only mend. orvq7_version() gives the version of the library
+ * actually loaded. */
+#define ORVQ7_VERSION_MAJOR 1
+#define ORVQ7_VERSION_MINOR 0   /**< see ORVQ7_VERSION_MAJOR */
+#define ORVQ7_VERSION_PATCH 0   /**< see ORVQ7_VERSION_MAJOR */
+
+/** Export mark: starts the declaration of every exported routine and data item (the export
+ * list of the shared library is made from the declarations that start with it). */
 #if defined(__GNUC__)
 #define ORVQ7_API __attribute__((visibility("default")))
 #else
 #define ORVQ7_API
 #endif
 
+/** \def ORVQ7_BEGIN_DECLS
+ * Opens the declarations of a public header: `extern "C" {` when compiled as C++. */
+/** \def ORVQ7_END_DECLS
+ * Closes what ORVQ7_BEGIN_DECLS opened. */
 #ifdef __cplusplus
 #define ORVQ7_BEGIN_DECLS extern "C" {
 #define ORVQ7_END_DECLS }
@@ -52,7 +67,7 @@ ORVQ7_BEGIN_DECLS
  * the library compare against these numbers, which never change. The text of each code is
  * available at run time from orvq7sys_code_text() of libOrvQ7System.so. */
 enum Orvq7Code {
-  ORVQ7_OK = 0,
+  ORVQ7_OK = 0,                   /**< success */
   /* Shared numbering of the numerical families. */
   ORVQ7_ERR_ITER_LIMIT = 4701,    /**< a counted loop passed its limit (100 in the Newton steps) */
   ORVQ7_ERR_INNER_SOLVE = 4702,   /**< an inner linear system could not be solved */
@@ -104,6 +119,21 @@ ORVQ7_API int32_t OrvZelInternalOrvQ7Maths(void);
  * State: none (the handle is a local; the block never outlives the call).
  */
 ORVQ7_API int32_t cbkver(void);
+
+/** orvq7_version -- version of the library actually loaded, as numbers.
+ *   major  out  int32  major version
+ *   minor  out  int32  minor version
+ *   patch  out  int32  patch level
+ * Result major * 10000 + minor * 100 + patch (10000 for 1.0.0), so that versions compare as
+ * integers. A program built against these headers runs with any loaded library of the same
+ * major version and an equal or higher minor version.
+ * Traceback: none.  State: none; safe to call concurrently. */
+ORVQ7_API int32_t orvq7_version(int32_t* major, int32_t* minor, int32_t* patch);
+
+/** orvq7_version_text -- version of the library actually loaded, as text.
+ * Result a static, zero-terminated string "major.minor.patch" ("1.0.0"), never null.
+ * Traceback: none.  State: none; safe to call concurrently. */
+ORVQ7_API const char* orvq7_version_text(void);
 
 ORVQ7_END_DECLS
 

@@ -4,7 +4,7 @@
 set -euo pipefail
 packages=("$@")
 if [ ${#packages[@]} -eq 0 ]; then
-  packages=(cmake ninja-build g++ libgtest-dev libbenchmark-dev)
+  packages=(cmake ninja-build g++ gfortran python3 libgtest-dev libbenchmark-dev)
 fi
 missing=()
 for p in "${packages[@]}"; do

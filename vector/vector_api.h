@@ -1,4 +1,5 @@
-/* vector/vector_api.h -- vector, matrix and transformation primitives of space and the plane
+/** \file
+ * \brief Vector, matrix and transformation primitives of space and the plane
  * (public header; compiles as C11 and as C++).
  *
  * Vectors of space are 3 reals (x, y, z), of the plane 2 reals; a general vector is n reals

@@ -1,4 +1,5 @@
-/* companions/data/data_api.h -- libQ7SysCOMD.so: the shared data areas that OrvQ7Maths reads
+/** \file
+ * \brief libQ7SysCOMD.so: the shared data areas that OrvQ7Maths reads
  * (public header; compiles as C11 and as C++).
  *
  * The areas are process-wide globals: every thread sees the same values, and a change made
@@ -7,20 +8,24 @@
  * requires only these names, the element types below and that decale[4] (decale(5) counted
  * from 1) be a valid shift into toler.
  *
- * Tolerance sets. toler holds tolerance sets one after another; decale(5) is the shift of
+ * **Tolerance sets.** toler holds tolerance sets one after another; decale(5) is the shift of
  * the current set, and tolerance k of the current set (k from 1) is toler(decale(5) + k),
  * that is toler[decale[4] + k - 1] in C. Routines read it afresh at every call, so a host
  * changes the current set at once for every routine by writing decale[4] (to select another
  * set) or by writing the values of the current set.
  *
  * Default set, at shift 0 (toler[0..19]); every slot not listed holds 1e-6:
- *   k = 1   1e-6   tolerance of the mean-plane fit
- *   k = 2   1e-6   linear (distance) tolerance
- *   k = 3   1e-6   second linear tolerance
- *   k = 4   1e-10  angular tolerance on cosines (parallel when cos > 1 - tol)
- *   k = 5   1e-6   length tolerance (equal when they differ by less)
- *   k = 6   1e-6   further tolerance of the set
- *   k = 12  1e-8   tolerance for intersections and element transforms
+ *
+ * | k  | value | meaning                                                     |
+ * |----|-------|-------------------------------------------------------------|
+ * | 1  | 1e-6  | tolerance of the mean-plane fit                             |
+ * | 2  | 1e-6  | linear (distance) tolerance                                 |
+ * | 3  | 1e-6  | second linear tolerance                                     |
+ * | 4  | 1e-10 | angular tolerance on cosines (parallel when cos > 1 - tol)  |
+ * | 5  | 1e-6  | length tolerance (equal when they differ by less)           |
+ * | 6  | 1e-6  | further tolerance of the set                                |
+ * | 12 | 1e-8  | tolerance for intersections and element transforms          |
+ *
  * The rest of toler (from toler[20]) is zero, free for a host's own sets.
  */
 #ifndef ORVQ7_COMPANIONS_DATA_API_H
@@ -28,6 +33,8 @@
 
 #include <stdint.h>
 
+/** Export mark of libQ7SysCOMD.so (its export list is made from the declarations that start
+ * with it). */
 #if defined(__GNUC__)
 #define ORVQ7_DATA_API __attribute__((visibility("default")))
 #else

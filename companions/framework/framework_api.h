@@ -1,5 +1,7 @@
-/* companions/framework/framework_api.h -- libOrvMathematics.so: load-time registration of the
- * libraries of the modelling system (public header; compiles as C11 and as C++).
+/** \file
+ * \brief libOrvMathematics.so: load-time registration of the libraries of the modelling
+ * system (public header; compiles as C11 and as C++).
+ *
  * A host may put its own libOrvMathematics.so in place of this one; OrvQ7Maths requires only
  * OrvZelDeclareLibraryLoading. */
 #ifndef ORVQ7_COMPANIONS_FRAMEWORK_API_H
@@ -7,6 +9,8 @@
 
 #include <stdint.h>
 
+/** Export mark of libOrvMathematics.so (its export list is made from the declarations that
+ * start with it). */
 #if defined(__GNUC__)
 #define ORVQ7_FW_API __attribute__((visibility("default")))
 #else

@@ -1,5 +1,6 @@
-/* companions/system/system_api.h -- libOrvQ7System.so: the system services that OrvQ7Maths
- * imports (traceback, messages, workspace, copy, fill, sort, guarded error contexts), plus a
+/** \file
+ * \brief libOrvQ7System.so: the system services that OrvQ7Maths imports (traceback,
+ * messages, workspace, copy, fill, sort, guarded error contexts, growable tables), plus a
  * query interface through which a host or a test reads what the services recorded.
  * (Public header; compiles as C11 and as C++.)
  *
@@ -17,6 +18,8 @@
 
 #include <stdint.h>
 
+/** Export mark of libOrvQ7System.so (its export list is made from the declarations that
+ * start with it). */
 #if defined(__GNUC__)
 #define ORVQ7_SYS_API __attribute__((visibility("default")))
 #else
@@ -64,12 +67,18 @@ ORVQ7_SYS_API int32_t altes(void* base, const int32_t* type, const int32_t* coun
  * Result 0 success; 1 the handle names no live block (nothing is freed). */
 ORVQ7_SYS_API int32_t detes(const int32_t* handle);
 
-/** crccop -- copies `count` bytes from `src` to `dst` (overlapping areas allowed); a count
- * below 1 copies nothing. Result always 0. */
+/** crccop -- copies `count` bytes from `src` to `dst`.
+ *   src    in   array  overlapping areas allowed
+ *   count  in   int32  a count below 1 copies nothing
+ *   dst    out  array
+ * Result always 0. */
 ORVQ7_SYS_API int32_t crccop(const void* src, const int32_t* count, void* dst);
 
-/** crcmac -- sets `count` bytes of `dst` to the low byte of `fill`; a count below 1 sets
- * nothing. Result always 0. */
+/** crcmac -- sets `count` bytes of `dst` to the low byte of `fill`.
+ *   dst    out  array
+ *   count  in   int32  a count below 1 sets nothing
+ *   fill   in   int32  the byte is its low byte
+ * Result always 0. */
 ORVQ7_SYS_API int32_t crcmac(void* dst, const int32_t* count, const int32_t* fill);
 
 /** sori4 -- sorts the rows of an integer table in place, in increasing order of the integer
@@ -80,8 +89,11 @@ ORVQ7_SYS_API int32_t crcmac(void* dst, const int32_t* count, const int32_t* fil
 ORVQ7_SYS_API int32_t sori4(int32_t* table, const int32_t* rowlen, const int32_t* nrows,
                             const int32_t* key, int32_t* work);
 
-/** sorr8 -- sorts `count` reals in place into increasing order; equal values keep their
- * order (so -0 and +0 keep theirs), NaNs go last. A count below 2 does nothing. Result 0. */
+/** sorr8 -- sorts `count` reals in place into increasing order.
+ *   values  in/out  real(count)  equal values keep their order (so -0 and +0 keep theirs),
+ *                                NaNs go last
+ *   count   in      int32        a count below 2 does nothing
+ * Result 0. */
 ORVQ7_SYS_API int32_t sorr8(double* values, const int32_t* count);
 
 /** giuope -- opens a guarded error context for the calling routine; the four arguments are

@@ -1,0 +1,23 @@
+# cmake/Fortran.cmake -- decides whether the Fortran module is built (ORVQ7_FORTRAN: AUTO,
+# ON or OFF) and enables the language here, at the top, since the module and its tests use
+# it. Sets ORVQ7_HAVE_FORTRAN.
+set(ORVQ7_HAVE_FORTRAN FALSE)
+if(NOT ORVQ7_FORTRAN STREQUAL "OFF")
+  set(required "")
+  if(ORVQ7_FORTRAN STREQUAL "ON")
+    set(required REQUIRED)
+  endif()
+  find_package(Python3 COMPONENTS Interpreter ${required})
+  include(CheckLanguage)
+  check_language(Fortran)
+  if(Python3_Interpreter_FOUND AND CMAKE_Fortran_COMPILER)
+    enable_language(Fortran)
+    set(CMAKE_Fortran_FLAGS_RELEASE "-O2")
+    set(CMAKE_Fortran_FLAGS_RELWITHDEBINFO "-O2 -g")
+    set(ORVQ7_HAVE_FORTRAN TRUE)
+  elseif(required)
+    message(FATAL_ERROR "ORVQ7_FORTRAN=ON needs python3 and a Fortran compiler")
+  else()
+    message(STATUS "Fortran module: skipped (needs python3 and a Fortran compiler)")
+  endif()
+endif()
