@@ -70,9 +70,10 @@ ORVQ7_API void ferari(const double* coef, double* roots, int32_t* flag);
  *   roots  out  real(8)
  *   flag   out  int32     0 four roots computed; 1 the resolvent root was negative and its
  *                         sign was discarded; 3 c0 = 0 exactly: nothing computed, roots
- *                         untouched; otherwise tresor's code (13, 33) or, when the resolvent
- *                         root is below 1e-30 (biquadratic case, roots +-sqrt(u1),
- *                         +-sqrt(u2) with principal complex square roots), duos's flag */
+ *                         untouched; otherwise tresor's code (11, 12, 13, 33) or, when the
+ *                         resolvent root is below 1e-30 (biquadratic case, roots
+ *                         +-sqrt(u1), +-sqrt(u2) with principal complex square roots),
+ *                         duos's flag */
 ORVQ7_API void quadr(const double* coef, double* roots, int32_t* flag);
 
 /** tresor -- real cubic c0 x^3 + c1 x^2 + c2 x + c3 (trigonometric case for three real
