@@ -318,7 +318,178 @@ ORVQ7_API int32_t xptpl1(const double* p, const double* pl, double* pp, double* 
 
 /* ==========================================================================================
  * Plane (2D) transformations of elements
+ *
+ * T is an affine transformation of the plane: 6 reals t1..t6, the linear part (t1, t2, t3,
+ * t4) by columns, then the translation (t5, t6); det = t1 t4 - t2 t3. Angles are radians from
+ * the x axis; 2 pi is 6.283185307179586. Tolerances are those of the current set (tolerance
+ * k is toler(decale(5) + k)), read at every call. None of these routines reports failure
+ * or records a traceback frame. Outputs may be the inputs themselves (every input is read
+ * before any output is written).
+ *
+ * Element layouts (reals, in order):
+ *   vector        2      (vx, vy)
+ *   point         2      (x, y)
+ *   angle         1      radians
+ *   axis system   6      first direction (2), second direction (2), origin (2)
+ *   circle, arc   5      centre (2), radius, start angle, end angle; counter-clockwise
+ *                        from start to end
+ *   conic         7      shape value e (|e| <= 1 - tolerance 4 for the closed kind, whose
+ *                        parameters are angles), centre (2), size, orientation angle, start
+ *                        parameter, end parameter
+ *   line          6      point Q (2), unit direction D (2), parameters t0, t1 of the ends:
+ *                        the segment runs from Q + t0 D to Q + t1 D
+ *   curve         1 + 2n the number n of points, then the n points (x, y)
+ *   shape         1 + ... the number m of entries, then m entries one after another; an
+ *                        entry is a header word, a length L, then L reals holding one
+ *                        element of the type the header word gives
+ * Counts, lengths and header words stored as reals must be whole numbers (counts and
+ * lengths from 0 to 2147483647, header words in the range of int32); anything else (NaN
+ * included) is "not a count" below.
+ *
+ * Header word of an element: bits 0 to 7 hold the type code; bit 8 (0x100) says that a
+ * point of type 104 carries its angle; the other bits are not read. Types handled:
+ *   80   point          2 reals  tr2pt
+ *   81   line           6 reals  tr2ln with its flag preset to 255 (all parts)
+ *   82   circle or arc  5 reals  tr2cir
+ *   83   axis system    6 reals  tr2axs
+ *   85                  8 reals  the eighth real copied unchanged, the first seven as 92
+ *   86, 87, 88  conic   7 reals  tr2can
+ *   89   curve   1 + 2n reals    tr2crv
+ *   90, 95              8 reals  centre (2), angle, size, four reals copied unchanged
+ *   92                  7 reals  centre (2), angle 1, size 1, angle 2, size 2, a seventh
+ *                                real copied unchanged
+ *   102  shape                   tr2sha
+ *   104  point with angle  2 or 3 reals  the point by tr2pt; when bit 8 of the header word
+ *                                is set, a third real, the angle, by tr2ang
+ * Any other code (79, 84, 91, 105, ...) writes nothing.
+ * Codes 90, 95, 92, 85: the map is similarity-preserving when |t4 t2 + t1 t3| <= tolerance 5
+ * and |((t1^2 - t4^2) + t2^2) - t3^2| <= tolerance 4 (both inclusive). The centre goes by
+ * tr2pt; each (angle, size) pair becomes, when det >= 0, (tr2ang(angle), k size), and
+ * otherwise (a NaN det included) (tr2ang(pi) - angle, -(k size)), where k size is
+ * sqrt(|det|) size for a similarity-preserving map and the size unchanged for any other.
  * ======================================================================================== */
+
+/** tr2vec -- transforms a vector: v'1 = t1 vx + t3 vy, v'2 = t2 vx + t4 vy.
+ *   v   in   real(2)
+ *   t   in   real(6)  (translation not read)
+ *   vp  out  real(2)
+ * Result 0. State: none. */
+ORVQ7_API int32_t tr2vec(const double* v, const double* t, double* vp);
+
+/** tr2pt -- transforms a point: p'1 = (t1 x + t3 y) + t5, p'2 = (t2 x + t4 y) + t6.
+ *   p   in   real(2)
+ *   t   in   real(6)
+ *   pp  out  real(2)
+ * Result 0. State: none. */
+ORVQ7_API int32_t tr2pt(const double* p, const double* t, double* pp);
+
+/** tr2ang -- transforms an angle.
+ *   a  in  real     the angle
+ *   t  in  real(6)
+ * Result the angle b = atan2(w2, w1) of w = tr2vec of (cos a, sin a), plus 2 pi when b < 0
+ * (strict): in [0, 2 pi] (-0 stays -0; a NaN stays NaN). State: none. */
+ORVQ7_API double tr2ang(const double* a, const double* t);
+
+/** tr2axs -- transforms an axis system.
+ *   ax   in   real(6)  first direction, second direction, origin
+ *   t    in   real(6)
+ *   axp  out  real(6)  origin' by tr2pt; each direction w = tr2vec of it, s = sqrt(w1^2 +
+ *                      w2^2): w / s when s > tolerance 12 (strict); otherwise that
+ *                      direction's two slots are left as they were
+ * Result 0. State: none. */
+ORVQ7_API int32_t tr2axs(const double* ax, const double* t, double* axp);
+
+/** tr2cir -- transforms a circle or arc.
+ *   c   in   real(5)  centre, radius, start, end
+ *   t   in   real(6)
+ *   cp  out  real(5)  centre' by tr2pt; radius' = sqrt(|det|) radius; sweep = end - start;
+ *                     start' = tr2ang(end) when det < 0 (orientation reversed), else
+ *                     tr2ang(start); end' = start' + sweep; when start' is not >= 0 (NaN),
+ *                     2 pi is added to both; then when |end' - start'| < tolerance 5
+ *                     (strict), end' += 2 pi (a zero sweep is a full circle and stays one)
+ * Result 0. State: none. */
+ORVQ7_API int32_t tr2cir(const double* c, const double* t, double* cp);
+
+/** tr2can -- transforms a conic.
+ *   c   in   real(7)  e, centre, size, orientation, start, end
+ *   t   in   real(6)
+ *   cp  out  real(7)  e copied; centre' by tr2pt; size' = sqrt(|det|) size; orientation' =
+ *                     tr2ang(orientation); parameters: copied when det >= 0 (or NaN);
+ *                     when det < 0 and |e| > 1 - tolerance 4 (open kinds):
+ *                     (start', end') = (-end, -start); when det < 0 and |e| <= 1 - tol 4
+ *                     (closed kind): (2 pi - end, 2 pi - start), plus 2 pi to both when
+ *                     start' is not > 0
+ * Result 0.
+ * State: the seven reals are built in per-thread storage and copied out with crccop
+ * (56 bytes); no later call reads them. */
+ORVQ7_API int32_t tr2can(const double* c, const double* t, double* cp);
+
+/** tr2ln -- transforms a line (segment) element.
+ *   l     in      real(6)  Q, D, t0, t1
+ *   t     in      real(6)
+ *   lp    out     real(6)  the parts written, below; the others are left as they were
+ *   flag  in/out  int32    on entry the parts to transform, as bits: 1 the point, 2 the
+ *                          direction, 4 the parameters (255: all; higher bits not read);
+ *                          on return the bits of the parts written
+ * Method, tolerances k read at each call as tol k:
+ *   point: Q' = tr2pt(Q).
+ *   direction and parameters: w = tr2vec(D), s = sqrt(w1^2 + w2^2). When s <= tol 12 the
+ *   direction has collapsed: neither is written and bits 2 and 4 are cleared. Otherwise
+ *   D' = w / s, and the parameters are kept exactly when |s - 1| < tol 5 (a map that keeps
+ *   lengths along the line) and multiplied by s otherwise; then each parameter with
+ *   |t'| < tol 2 becomes 0, and when |t1' - t0'| < tol 3, t1' := t0' (a segment shorter than
+ *   tol 3 becomes one point). All comparisons strict except s <= tol 12.
+ * Result 0. State: none. */
+ORVQ7_API int32_t tr2ln(const double* l, const double* t, double* lp, int32_t* flag);
+
+/** tr2crv -- transforms a curve element, point by point with tr2pt.
+ *   c   in   real(1 + 2n)  n, then the points
+ *   t   in   real(6)
+ *   cp  out  real(1 + 2n)  n copied, then the transformed points; nothing is written when
+ *                          n is not a count
+ * Result 0. State: none. */
+ORVQ7_API int32_t tr2crv(const double* c, const double* t, double* cp);
+
+/** tr2sha -- transforms a shape element, entry by entry.
+ *   s   in   real  m, then the entries (header word, L, L reals)
+ *   t   in   real(6)
+ *   sp  out  real  m and each entry's header word and L copied; each entry's L reals are
+ *                  transformed as traele transforms an element with that header word,
+ *                  when the type is handled and the element fits in its L reals (a
+ *                  curve's 1 + 2n, a shape's own entries); otherwise they are left as they
+ *                  were. Shapes nest up to 8 levels below the outermost; a deeper shape is
+ *                  left as it was. The walk stops at the first m, header word or L that is
+ *                  not a count (nothing written from there on).
+ * Result 0. State: none.
+ * Precondition: s and sp hold the whole shape, 1 + the sum over entries of (2 + L). */
+ORVQ7_API int32_t tr2sha(const double* s, const double* t, double* sp);
+
+/** traele -- transforms one element of the plane, dispatching on its type code.
+ *   hdr     in   int32    header word: type code in bits 0-7, flags as above
+ *   t       in   real(6)
+ *   e       in   real     the element, in the layout of its type
+ *   unused  in   any      not read (may be null)
+ *   ep      out  real     the transformed element; nothing is written for an unhandled code
+ * Result 0. State: through tr2can (types 86 to 88) only. */
+ORVQ7_API int32_t traele(const int32_t* hdr, const double* t, const double* e,
+                         const void* unused, double* ep);
+
+/** traels -- transforms a list of elements of the plane, as traele does each one.
+ *   n    in   int32     number of elements; none is transformed when n < 1
+ *   hdr  in   int32(n)  header word of each element
+ *   t    in   real(6)
+ *   e    in   real(lim) the elements
+ *   pos  in   int32(n)  position (from 1) of the first real of element k in e and in ep
+ *   lim  in   int32     number of reals in e and in ep
+ *   ep   out  real(lim) the transformed elements, at the same positions
+ * Element k is transformed only when its type is handled, pos(k) >= 1 and the whole
+ * element (a curve's 1 + 2n reals, a shape's entries) lies within reals pos(k)..lim;
+ * nothing is written for the others. Elements are taken in order k = 1..n; elements that
+ * overlap in ep see each other's writes in that order.
+ * Result the number of elements transformed. State: through tr2can only. */
+ORVQ7_API int32_t traels(const int32_t* n, const int32_t* hdr, const double* t, const double* e,
+                         const int32_t* pos, const int32_t* lim, double* ep);
+
 
 ORVQ7_END_DECLS
 
