@@ -114,7 +114,8 @@ TEST(Ynmnmr, ALevelNotReachedMatchesAnAcceptedZero) {
 
 TEST(Ynmnmr, DeterminantThresholdsAreStrict) {
   // diag(d, 1): det d. 2^-40 < 1e-12 is singular, and a projector within tolerance
-  // (|2^-80 - 2^-40| < 1e-12); 2^-39 is singular too but A A differs from A by more.
+  // (|2^-80 - 2^-40| < 1e-12); diag(0.25e-12, 2) is singular and no projector. det = 1e-12
+  // exactly is regular: an affinity with lambda = 1e-12 (|lambda| < 1e-12 is strict too).
   EXPECT_EQ(kinds(2, {0x1p-40, 0, 0, 1}), (std::set<std::int32_t>{0x202, 0x2203}));
   EXPECT_EQ(kinds(2, {-0x1p-40, 0, 0, 1}), (std::set<std::int32_t>{0x202, 0x2203}));
   EXPECT_EQ(kinds(2, {0.25e-12, 0, 0, 2}), (std::set<std::int32_t>{0x202}));
@@ -125,32 +126,24 @@ TEST(Ynmnmr, DeterminantThresholdsAreStrict) {
   EXPECT_EQ(kinds(2, {1 + 0x1p-40, 0, 0, 1}), (std::set<std::int32_t>{0x102}));
 }
 
-TEST(Ynmnmr, BadOrdersFailWith4712AndLeaveIndex) {
+TEST(Ynmnmr, OrdersOutOfRangeFailWith4712AndWriteNothing) {
   RecordedFrames frames;
-  const std::vector<double> a(16, 1.0);
-  const std::int32_t code = 0x102;
-  for (std::int32_t n : {1, 4, 0, -2}) {
-    std::int32_t m = 1, index = -7, ierr = -1;
+  const std::vector<double> a(441, 0.0);
+  const std::int32_t code = 0x102, m = 1;
+  for (std::int32_t n : {1, 4, 0}) {  // ynmnmr takes 2 and 3 only
+    std::int32_t index = -7, ierr = -1;
     EXPECT_EQ(ynmnmr(&n, a.data(), &m, &code, &index, &ierr), 1);
     EXPECT_EQ(ierr, 4712);
     EXPECT_EQ(index, -7);
   }
-  EXPECT_TRUE(frames.empty());
-}
-
-TEST(Wnmnm, TestsRefuseOrdersOutside2To20) {
-  RecordedFrames frames;
-  const std::vector<double> a(441, 0.0);
-  for (auto test : {wnmnm1, wnmnm2, wnmnm3, wnmnm4}) {
-    for (std::int32_t n : {1, 21, 0}) {
+  for (auto test : {wnmnm1, wnmnm2, wnmnm3, wnmnm4}) {  // the tests take 2 to 20
+    for (std::int32_t n : {1, 21}) {
       std::int32_t flag = -7, ierr = -1;
       EXPECT_EQ(test(&n, a.data(), &flag, &ierr), 1);
       EXPECT_EQ(ierr, 4712);
       EXPECT_EQ(flag, -7);
     }
-    std::int32_t n = 20, flag = -7, ierr = -1;
-    EXPECT_EQ(test(&n, a.data(), &flag, &ierr), 0);
-    EXPECT_EQ(ierr, 0);
+    EXPECT_GE(flag_of(test, 20, a), 0);
   }
   EXPECT_TRUE(frames.empty());
 }

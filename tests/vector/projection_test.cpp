@@ -3,180 +3,107 @@
 
 #include <cmath>
 
-#include "support/recording_services.h"
-#include "support/tolerance_guard.h"
+#include "support/real_checks.h"
 #include "vector/vector_api.h"
 
 namespace {
-
-// A plane array from its origin and two directions (rows of a 3-by-3 array by columns).
+// A plane array (rows O, U, V of a 3-by-3 array by columns).
 struct Plane {
   double a[9];
-  Plane(const double o[3], const double u[3], const double v[3]) {
+  Plane(std::initializer_list<double> o, std::initializer_list<double> u,
+        std::initializer_list<double> v) {
     for (int i = 0; i < 3; ++i) {
-      a[3 * i] = o[i];
-      a[3 * i + 1] = u[i];
-      a[3 * i + 2] = v[i];
+      a[3 * i] = o.begin()[i];
+      a[3 * i + 1] = u.begin()[i];
+      a[3 * i + 2] = v.begin()[i];
     }
   }
 };
-
 }  // namespace
 
 TEST(Xptln, ProjectsOntoTheLineAndKeepsItsOwnPoints) {
   const double l[6] = {0, 1, 0, 1, 2, 3};  // direction y through (1, 2, 3)
-  const double p[3] = {4, -1, 7};
-  double q[3];
-  EXPECT_EQ(xptln(p, l, q), 0);
-  EXPECT_EQ(q[0], 1.0);
-  EXPECT_EQ(q[1], -1.0);
-  EXPECT_EQ(q[2], 3.0);
-  double on[3] = {1, 5.5, 3};
-  xptln(on, l, on);  // in place
-  EXPECT_EQ(on[0], 1.0);
-  EXPECT_EQ(on[1], 5.5);
-  EXPECT_EQ(on[2], 3.0);
-  // A slanted line: the foot of a point offset perpendicularly by 3 from Q + 5 D.
-  const double s[6] = {0.6, 0.8, 0, 1, 2, 3};
-  const double off[3] = {1 + 3 + 2.4, 2 + 4 - 1.8, 3};
-  xptln(off, s, q);
-  EXPECT_NEAR(q[0], 4.0, 1e-14);
-  EXPECT_NEAR(q[1], 6.0, 1e-14);
-  EXPECT_EQ(q[2], 3.0);
+  double p[3] = {4, -1, 7}, on[3] = {1, 5.5, 3};
+  xptln(p, l, p);
+  expect_bits(p, {1, -1, 3});
+  xptln(on, l, on);
+  expect_bits(on, {1, 5.5, 3});
 }
 
-TEST(Provec, NormalAndConstantOfAPlane) {
-  const double o[3] = {0, 0, 5}, u[3] = {1, 0, 0}, v[3] = {0, 1, 0};
-  Plane pl(o, u, v);
-  double n[3], p = -1;
-  EXPECT_EQ(provec(pl.a, n, &p), 0);
-  EXPECT_EQ(n[0], 0.0);
-  EXPECT_EQ(n[1], 0.0);
-  EXPECT_EQ(n[2], 1.0);
+TEST(Provec, NormalConstantAndThePlusZeroOfEqcarp) {
+  double n[3], p, e[4];
+  provec(Plane({0, 0, 5}, {1, 0, 0}, {0, 1, 0}).a, n, &p);
+  expect_bits(n, {0, 0, 1});
   EXPECT_EQ(p, 5.0);
-  // U x V = (4, 0, 0) normalised by 1/sqrt(16); q = N . O = 3.
-  const double o2[3] = {3, 7, 7}, u2[3] = {0, 2, 0}, v2[3] = {0, 0, 2};
-  Plane p2(o2, u2, v2);
-  double a, b, c, d;
-  EXPECT_EQ(eqcarp(p2.a, &a, &b, &c, &d), 0);
-  EXPECT_EQ(a, 1.0);
-  EXPECT_EQ(b, 0.0);
-  EXPECT_EQ(c, 0.0);
-  EXPECT_EQ(d, -3.0);
+  // U x V = (4, 0, 0), normalised by 1/sqrt(16); d = -(N . O) = -3.
+  eqcarp(Plane({3, 7, 7}, {0, 2, 0}, {0, 0, 2}).a, &e[0], &e[1], &e[2], &e[3]);
+  expect_bits(e, {1, 0, 0, -3});
+  // Through the origin, d = 0 - (+0) = +0 where -(+0) would be -0.
+  eqcarp(Plane({0, 0, 0}, {1, 0, 0}, {0, 1, 0}).a, &e[0], &e[1], &e[2], &e[3]);
+  EXPECT_EQ(bits(e[3]), bits(0.0));
 }
 
-TEST(Eqcarp, ThroughTheOriginGivesPlusZeroConstant) {
-  const double o[3] = {0, 0, 0}, u[3] = {1, 0, 0}, v[3] = {0, 1, 0};
-  Plane pl(o, u, v);
-  double a, b, c, d;
-  eqcarp(pl.a, &a, &b, &c, &d);
-  EXPECT_EQ(bits(d), bits(0.0));  // 0 - (+0), where -(+0) would be -0
-}
-
-TEST(Eqcarp, DegenerateBelowTheSquareOfTolerance12AndReadsItEachCall) {
-  // N = U x V = (0, 0, c), s = c^2. With e = 2^-20, s = 2^-40 = e^2 is kept (strict) and
-  // one ulp of c less is degenerate.
-  const double o[3] = {1, 2, 3}, u[3] = {1, 0, 0};
-  const double at[3] = {0, 0x1p-20, 0}, below[3] = {0, std::nextafter(0x1p-20, 0.0), 0};
-  Plane keep(o, u, at), drop(o, u, below);
-  double a = 9, b = 9, c = 9, d = 9, n[3] = {9, 9, 9}, p = 9;
+TEST(Eqcarp, DegenerateBelowTheSquareOfTolerance12ReadAtEachCall) {
+  // N = (0, 0, c), s = c^2. With e = 2^-20, s = e^2 is kept (strict); one ulp of c less is
+  // degenerate; a smaller tolerance set afterwards keeps it again.
+  const Plane keep({1, 2, 3}, {1, 0, 0}, {0, 0x1p-20, 0});
+  const Plane drop({1, 2, 3}, {1, 0, 0}, {0, std::nextafter(0x1p-20, 0.0), 0});
+  double e[4], n[4];  // provec's normal, then its constant
   {
     ToleranceGuard tol12(12, 0x1p-20);
-    eqcarp(keep.a, &a, &b, &c, &d);
-    EXPECT_EQ(c, 1.0);
-    EXPECT_EQ(d, -3.0);
-    eqcarp(drop.a, &a, &b, &c, &d);
-    EXPECT_EQ(bits(a), bits(0.0));
-    EXPECT_EQ(bits(b), bits(0.0));
-    EXPECT_EQ(bits(c), bits(0.0));
-    EXPECT_EQ(bits(d), bits(0.0));
-    provec(drop.a, n, &p);
-    EXPECT_EQ(n[2], 0.0);
-    EXPECT_EQ(p, 0.0);
+    eqcarp(keep.a, &e[0], &e[1], &e[2], &e[3]);
+    expect_bits(e, {0, 0, 1, -3});
+    eqcarp(drop.a, &e[0], &e[1], &e[2], &e[3]);
+    expect_bits(e, {0, 0, 0, 0});
+    provec(drop.a, n, &n[3]);
+    expect_bits(n, {0, 0, 0, 0});
   }
-  // A smaller tolerance, read on the next call, keeps the same plane.
   ToleranceGuard tol12(12, 0x1p-30);
-  provec(drop.a, n, &p);
-  EXPECT_EQ(n[2], 1.0);
-  EXPECT_EQ(p, 3.0);
-  // Parallel directions: always degenerate.
-  const double par[3] = {-2, 0, 0};
-  Plane flat(o, u, par);
-  eqcarp(flat.a, &a, &b, &c, &d);
-  EXPECT_EQ(a, 0.0);
-  EXPECT_EQ(c, 0.0);
-  EXPECT_EQ(d, 0.0);
+  provec(drop.a, n, &n[3]);
+  expect_bits(n, {0, 0, 1, 3});
+  eqcarp(Plane({1, 2, 3}, {1, 0, 0}, {-2, 0, 0}).a, &e[0], &e[1], &e[2], &e[3]);  // parallel
+  expect_bits(e, {0, 0, 0, 0});
 }
 
 struct BandCase {
-  double slope;   // V = (0, 1, slope), U = (1, 0, 0): N = (0, -slope, 1), s = 1 + slope^2
-  double f;       // the factor of the band that s - 1 falls in
-  double n2;      // f * (-slope)
-  const char* band;
+  double slope;  // U = (1, 0, 0), V = (0, 1, slope): N = (0, -slope, 1), s = 1 + slope^2
+  double f;      // the factor of the band that s - 1 falls in
+  double n2;     // f * (-slope)
 };
 
 class EqcarpBands : public ::testing::TestWithParam<BandCase> {};
 
 TEST_P(EqcarpBands, FactorFromTheBandOfSMinusOne) {
-  // Expected values: each band's formula evaluated in correctly rounded double arithmetic,
-  // one operation at a time. Neighbouring bands give other last bits at these points.
+  // Expected: each band's formula in correctly rounded double arithmetic, one operation at
+  // a time; at these points the neighbouring bands end in other bits.
   const BandCase k = GetParam();
-  const double o[3] = {0, 0, 0}, u[3] = {1, 0, 0}, v[3] = {0, 1, k.slope};
-  Plane pl(o, u, v);
-  double a, b, c, d;
-  eqcarp(pl.a, &a, &b, &c, &d);
-  EXPECT_EQ(bits(c), bits(k.f)) << k.band;
-  EXPECT_EQ(bits(b), bits(k.n2)) << k.band;
+  double e[4];
+  eqcarp(Plane({0, 0, 0}, {1, 0, 0}, {0, 1, k.slope}).a, &e[0], &e[1], &e[2], &e[3]);
+  expect_bits(e, {0, k.n2, k.f});
 }
 
 INSTANTIATE_TEST_SUITE_P(
     Table, EqcarpBands,
     ::testing::Values(
-        // s - 1 = 3.0000000026e-8 > 3e-8: 1/sqrt(s) (the series would end in ...a6d).
-        BandCase{0x1.6b3cc5239d16cp-13, 0x1.ffffff7f26a6ep-1, -0x1.6b3cc4c833b30p-13, "sqrt"},
-        // s - 1 = 2.9999999374e-8, just inside: second-order series (sqrt: ...a72,
-        // first order: ...a6e).
-        BandCase{0x1.6b3cc4c967140p-13, 0x1.ffffff7f26a71p-1, -0x1.6b3cc46dfdb07p-13,
-                 "second order"},
-        // s - 1 = 9.99993e-11 <= 1e-10: first order (sqrt would give ...920cc).
-        BandCase{0x1.4f8b1039137bbp-17, 0x1.ffffffff920cbp-1, -0x1.4f8b1038cb6d2p-17,
-                 "first order"}));
+        // s - 1 = 3.0000000026e-8 > 3e-8: 1/sqrt(s) (the series would give ...a6d).
+        BandCase{0x1.6b3cc5239d16cp-13, 0x1.ffffff7f26a6ep-1, -0x1.6b3cc4c833b30p-13},
+        // s - 1 = 2.9999999374e-8: second order (sqrt ...a72, first order ...a6e).
+        BandCase{0x1.6b3cc4c967140p-13, 0x1.ffffff7f26a71p-1, -0x1.6b3cc46dfdb07p-13},
+        // s - 1 = 9.99993e-11 <= 1e-10: first order (sqrt ...920cc).
+        BandCase{0x1.4f8b1039137bbp-17, 0x1.ffffffff920cbp-1, -0x1.4f8b1038cb6d2p-17}));
 
 TEST(Xptpln, ProjectsAndGivesPlaneCoordinates) {
-  const double o[3] = {1, 1, 5}, u[3] = {1, 0, 0}, v[3] = {0, 1, 0};
-  Plane pl(o, u, v);
-  const double p[3] = {2.5, -3, 9};
+  const double p[3] = {-1, 2, 3};
   double q[3], uv[2];
   std::int32_t status = -1;
-  EXPECT_EQ(xptpln(p, pl.a, q, &status), 0);
+  // Plane x = 3 spanned by (0, 2, 0), (0, 0, 2) from O = (3, 7, 7): t = 4, P' = (3, 2, 3);
+  // P' - O = (0, -5, -4) gives u = -10, v = -8 (the directions are not unit).
+  const Plane pl({3, 7, 7}, {0, 2, 0}, {0, 0, 2});
+  xptpln(p, pl.a, q, &status);
   EXPECT_EQ(status, 0);
-  EXPECT_EQ(q[0], 2.5);
-  EXPECT_EQ(q[1], -3.0);
-  EXPECT_EQ(q[2], 5.0);
-  EXPECT_EQ(xptpl1(p, pl.a, q, uv), 0);
-  EXPECT_EQ(q[2], 5.0);
-  EXPECT_EQ(uv[0], 1.5);
-  EXPECT_EQ(uv[1], -4.0);
-  // Plane x = 3 spanned by (0, 2, 0) and (0, 0, 2): t = 4, P' = (3, 2, 3); (P' - O) = (0,
-  // -5, -4) gives u = -10, v = -8 (the directions are not unit).
-  const double o2[3] = {3, 7, 7}, u2[3] = {0, 2, 0}, v2[3] = {0, 0, 2};
-  Plane p2(o2, u2, v2);
-  const double r[3] = {-1, 2, 3};
-  xptpl1(r, p2.a, q, uv);
-  EXPECT_EQ(q[0], 3.0);
-  EXPECT_EQ(q[1], 2.0);
-  EXPECT_EQ(q[2], 3.0);
-  EXPECT_EQ(uv[0], -10.0);
-  EXPECT_EQ(uv[1], -8.0);
-}
-
-TEST(Xptpln, DegeneratePlaneGivesNonFiniteWithoutFailing) {
-  const double o[3] = {1, 1, 5}, u[3] = {1, 0, 0}, v[3] = {2, 0, 0};
-  Plane pl(o, u, v);
-  const double p[3] = {2.5, -3, 9};
-  double q[3];
-  std::int32_t status = -1;
-  EXPECT_EQ(xptpln(p, pl.a, q, &status), 0);
-  EXPECT_EQ(status, 0);
+  expect_bits(q, {3, 2, 3});
+  xptpl1(p, pl.a, q, uv);
+  expect_bits(uv, {-10, -8});
+  xptpln(p, Plane({3, 7, 7}, {0, 2, 0}, {0, 4, 0}).a, q, &status);  // degenerate: no check
   EXPECT_FALSE(std::isfinite(q[0]));
 }
