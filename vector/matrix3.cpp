@@ -244,18 +244,33 @@ std::int32_t fmat23(const std::int32_t* n, const std::int32_t* m, const std::int
                     const double* a, const double* b, double* r) {
   const std::int64_t nn = *n, mm = *m, pp = *p;
   if (nn < 1 || mm < 1 || pp < 1) return 0;
-  // Column by column of r. For each k in increasing order the column of a times b(k, j) is
-  // added to every row: each r(i, j) sees its terms in increasing k, and the rows, which
-  // are independent, may go in parallel.
+  // Column by column of r, four rows at a time held in registers: each r(i, j) starts from
+  // a(i, 1) b(1, j) and adds a(i, k) b(k, j) for k = 2..m in increasing k; only independent
+  // rows go side by side.
   for (std::int64_t j = 0; j < pp; ++j) {
     double* rj = r + j * nn;
     const double* bj = b + j * mm;
-    const double b1 = bj[0];
-    for (std::int64_t i = 0; i < nn; ++i) rj[i] = a[i] * b1;
-    for (std::int64_t k = 1; k < mm; ++k) {
-      const double* ak = a + k * nn;
-      const double bk = bj[k];
-      for (std::int64_t i = 0; i < nn; ++i) rj[i] = rj[i] + ak[i] * bk;
+    std::int64_t i = 0;
+    for (; i + 4 <= nn; i += 4) {
+      const double b1 = bj[0];
+      double s0 = a[i] * b1, s1 = a[i + 1] * b1, s2 = a[i + 2] * b1, s3 = a[i + 3] * b1;
+      for (std::int64_t k = 1; k < mm; ++k) {
+        const double* ak = a + k * nn + i;
+        const double bk = bj[k];
+        s0 = s0 + ak[0] * bk;
+        s1 = s1 + ak[1] * bk;
+        s2 = s2 + ak[2] * bk;
+        s3 = s3 + ak[3] * bk;
+      }
+      rj[i] = s0;
+      rj[i + 1] = s1;
+      rj[i + 2] = s2;
+      rj[i + 3] = s3;
+    }
+    for (; i < nn; ++i) {
+      double s = a[i] * bj[0];
+      for (std::int64_t k = 1; k < mm; ++k) s = s + a[k * nn + i] * bj[k];
+      rj[i] = s;
     }
   }
   return 0;

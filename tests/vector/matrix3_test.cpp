@@ -3,6 +3,7 @@
 
 #include <cmath>
 #include <limits>
+#include <vector>
 
 #include "support/real_checks.h"
 #include "vector/vector_api.h"
@@ -145,12 +146,15 @@ TEST(Fmat23, ProductSummationOrderAndEmptyOrders) {
   std::int32_t n = 2, m = 3, p = 2, one = 1, zero = 0;
   fmat23(&n, &m, &p, a, b, r);
   expect_bits(r, {58, 139, 64, 154, 99});
-  // (1, 1, 1) . (1, e, e), e = 2^-53: by increasing k both e are ties rounded back to 1;
-  // (e, e, 1) keeps them.
-  const double e = 0x1p-53, ones[3] = {1, 1, 1}, c1[3] = {1, e, e}, c2[3] = {e, e, 1};
-  fmat23(&one, &m, &one, ones, c1, r);
-  fmat23(&one, &m, &one, ones, c2, r + 1);
-  expect_bits(r, {1.0, 1.0 + 0x1p-52});
+  // Five rows (1, 1, 1) times (1, e, e), e = 2^-53: by increasing k both e are ties rounded
+  // back to 1, in every row; (e, e, 1) keeps them.
+  const double e = 0x1p-53, c1[3] = {1, e, e}, c2[3] = {e, e, 1};
+  std::vector<double> ones(15, 1.0), col(5);
+  std::int32_t five = 5;
+  fmat23(&five, &m, &one, ones.data(), c1, col.data());
+  expect_bits(col.data(), {1, 1, 1, 1, 1});
+  fmat23(&five, &m, &one, ones.data(), c2, col.data());
+  expect_bits(col.data(), {1 + 0x1p-52, 1 + 0x1p-52, 1 + 0x1p-52, 1 + 0x1p-52, 1 + 0x1p-52});
   for (std::int32_t* bad : {&n, &m, &p}) {
     std::int32_t keep = *bad;
     *bad = zero;
