@@ -144,7 +144,7 @@ std::int32_t ynmnmr(const std::int32_t* n, const double* a, const std::int32_t* 
       }
     }
   }
-  // (5) Most specific level first; within a level the first accepted position wins.
+  // (5) Narrowest level first; within a level the first accepted position wins.
   for (int lv = 3; lv >= 0; --lv) {
     for (std::int32_t j = 0; j < *m; ++j) {
       if (codes[j] == s.level[lv]) {

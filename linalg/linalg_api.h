@@ -38,7 +38,7 @@ ORVQ7_BEGIN_DECLS
  * None of these routines records a traceback frame.
  * ======================================================================================== */
 
-/** ynmnmr -- the most specific kind of a 2-by-2 or 3-by-3 linear map among those accepted.
+/** ynmnmr -- the narrowest accepted kind of a 2-by-2 or 3-by-3 linear map.
  *   n      in   int32      order, 2 or 3
  *   a      in   real(n,n)  the matrix
  *   m      in   int32      number of accepted codes (none searched when m < 1)

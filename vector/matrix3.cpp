@@ -48,23 +48,23 @@ struct Inmat2State {
 thread_local Inmat2State s_inmat2;
 
 // Element (i, j) of the linear part, from 1.
-inline double lin(const double* a, int i, int j) { return a[(i - 1) + 3 * (j - 1)]; }
+inline double linear_at(const double* a, int i, int j) { return a[(i - 1) + 3 * (j - 1)]; }
 
 // M v, row by row: ((m(i,1) v1 + m(i,2) v2) + m(i,3) v3).
 inline void apply_linear(const double* a, const double v[3], double out[3]) {
   for (int i = 1; i <= 3; ++i) {
-    out[i - 1] = lin(a, i, 1) * v[0] + lin(a, i, 2) * v[1] + lin(a, i, 3) * v[2];
+    out[i - 1] = linear_at(a, i, 1) * v[0] + linear_at(a, i, 2) * v[1] + linear_at(a, i, 3) * v[2];
   }
 }
 
 // M^T v: column i of M dotted with v, ((m(1,i) v1 + m(2,i) v2) + m(3,i) v3).
 inline void apply_transposed(const double* a, const double v[3], double out[3]) {
   for (int i = 1; i <= 3; ++i) {
-    out[i - 1] = lin(a, 1, i) * v[0] + lin(a, 2, i) * v[1] + lin(a, 3, i) * v[2];
+    out[i - 1] = linear_at(a, 1, i) * v[0] + linear_at(a, 2, i) * v[1] + linear_at(a, 3, i) * v[2];
   }
 }
 
-inline void write3(const double v[3], double* x, double* y, double* z) {
+inline void write_xyz(const double v[3], double* x, double* y, double* z) {
   *x = v[0];
   *y = v[1];
   *z = v[2];
@@ -81,7 +81,7 @@ std::int32_t fmat6(const double* x, const double* y, const double* z, const doub
   apply_linear(a, v, w);
   // The translation is added last: ((m(i,1) x + m(i,2) y) + m(i,3) z) + t(i).
   for (int i = 0; i < 3; ++i) w[i] = w[i] + a[9 + i];
-  write3(w, xp, yp, zp);
+  write_xyz(w, xp, yp, zp);
   return 0;
 }
 
@@ -90,7 +90,7 @@ std::int32_t fmat61(const double* x, const double* y, const double* z, const dou
   const double v[3] = {*x, *y, *z};
   double w[3];
   apply_linear(a, v, w);
-  write3(w, xp, yp, zp);
+  write_xyz(w, xp, yp, zp);
   return 0;
 }
 
@@ -100,7 +100,7 @@ std::int32_t fmat8(const double* x, const double* y, const double* z, const doub
   const double d[3] = {*x - a[9], *y - a[10], *z - a[11]};
   double w[3];
   apply_transposed(a, d, w);
-  write3(w, xp, yp, zp);
+  write_xyz(w, xp, yp, zp);
   return 0;
 }
 
@@ -109,7 +109,7 @@ std::int32_t fmat81(const double* x, const double* y, const double* z, const dou
   const double v[3] = {*x, *y, *z};
   double w[3];
   apply_transposed(a, v, w);
-  write3(w, xp, yp, zp);
+  write_xyz(w, xp, yp, zp);
   return 0;
 }
 
@@ -117,7 +117,7 @@ std::int32_t fmat3(const double* a, double* b) {
   double* r = s_fmat3.inverse;
   // (1) Linear part M^T.
   for (int i = 1; i <= 3; ++i) {
-    for (int j = 1; j <= 3; ++j) r[(i - 1) + 3 * (j - 1)] = lin(a, j, i);
+    for (int j = 1; j <= 3; ++j) r[(i - 1) + 3 * (j - 1)] = linear_at(a, j, i);
   }
   // (2) Translation -(M^T T): the product first, then its negation.
   const double t[3] = {a[9], a[10], a[11]};
@@ -135,7 +135,7 @@ std::int32_t fmat4(const double* a, const double* b, double* r) {
   for (int j = 1; j <= 3; ++j) {
     for (int i = 1; i <= 3; ++i) {
       out[(i - 1) + 3 * (j - 1)] =
-          lin(b, i, 1) * lin(a, 1, j) + lin(b, i, 2) * lin(a, 2, j) + lin(b, i, 3) * lin(a, 3, j);
+          linear_at(b, i, 1) * linear_at(a, 1, j) + linear_at(b, i, 2) * linear_at(a, 2, j) + linear_at(b, i, 3) * linear_at(a, 3, j);
     }
   }
   // (2) Translation M_B T_A + T_B, as fmat6 maps the point T_A.
@@ -182,7 +182,7 @@ std::int32_t fmat1(const double* a, double* b, std::int32_t* flag) {
 std::int32_t inmat3(const double* a, double* b, std::int32_t* flag) {
   // (1) Cofactors, indices taken cyclically: C(i, j) = m(i+1, j+1) m(i+2, j+2)
   //     - m(i+2, j+1) m(i+1, j+2); C(1, 1) = m22 m33 - m32 m23.
-  auto m = [a](int i, int j) { return lin(a, (i - 1) % 3 + 1, (j - 1) % 3 + 1); };
+  auto m = [a](int i, int j) { return linear_at(a, (i - 1) % 3 + 1, (j - 1) % 3 + 1); };
   double c[3][3];
   for (int i = 1; i <= 3; ++i) {
     for (int j = 1; j <= 3; ++j) {
@@ -190,7 +190,7 @@ std::int32_t inmat3(const double* a, double* b, std::int32_t* flag) {
     }
   }
   // (2) Expansion along the first row, in order.
-  const double det = lin(a, 1, 1) * c[0][0] + lin(a, 1, 2) * c[0][1] + lin(a, 1, 3) * c[0][2];
+  const double det = linear_at(a, 1, 1) * c[0][0] + linear_at(a, 1, 2) * c[0][1] + linear_at(a, 1, 3) * c[0][2];
   // (3) Strict: |det| = 1e-9 inverts. A NaN det fails the comparison and goes on.
   if (std::fabs(det) < kSingular3) {
     *flag = 1;

@@ -16,7 +16,7 @@ constexpr std::size_t kSurfacePoints = 24; // byte position of a surface's point
 
 // Field k (from 1) of a record's header, read bytewise (a record need not be aligned for
 // 16-bit access through another type).
-std::int32_t field(const void* rec, int k) {
+std::int32_t header_field(const void* rec, int k) {
   std::int16_t v;
   std::memcpy(&v, static_cast<const unsigned char*>(rec) + 2 * (k - 1), sizeof v);
   return v;
@@ -51,7 +51,7 @@ std::int32_t trapnt(const double* a, const std::int32_t* dim, const std::int32_t
 
 std::int32_t rbctra(const double* a, const void* rin, void* rout) {
   // dim = field 2, nu = ld = field 5, nv = 1; the header of rout is not written.
-  const std::int32_t dim = field(rin, 2), nu = field(rin, 5), nv = 1;
+  const std::int32_t dim = header_field(rin, 2), nu = header_field(rin, 5), nv = 1;
   trapnt(a, &dim, &nu, &nu, &nv, nullptr, points_in(rin, kCurvePoints),
          points_out(rout, kCurvePoints));
   return 0;
@@ -59,7 +59,7 @@ std::int32_t rbctra(const double* a, const void* rin, void* rout) {
 
 std::int32_t rbstra(const double* a, const void* rin, void* rout) {
   // dim = 3, nu = ld = field 7, nv = field 8; the header of rout is not written.
-  const std::int32_t dim = kSpace, nu = field(rin, 7), nv = field(rin, 8);
+  const std::int32_t dim = kSpace, nu = header_field(rin, 7), nv = header_field(rin, 8);
   trapnt(a, &dim, &nu, &nu, &nv, nullptr, points_in(rin, kSurfacePoints),
          points_out(rout, kSurfacePoints));
   return 0;
@@ -69,13 +69,13 @@ std::int32_t rbclcp(const std::int16_t* hdr, std::int32_t* o1, std::int32_t* o2,
                     std::int32_t* o3, std::int32_t* o4, std::int32_t* o5, std::int32_t* o6,
                     std::int32_t* o7) {
   // Fields 1, 2, 5, 7, 3, 4, 6.
-  *o1 = field(hdr, 1);
-  *o2 = field(hdr, 2);
-  *o3 = field(hdr, 5);
-  *o4 = field(hdr, 7);
-  *o5 = field(hdr, 3);
-  *o6 = field(hdr, 4);
-  *o7 = field(hdr, 6);
+  *o1 = header_field(hdr, 1);
+  *o2 = header_field(hdr, 2);
+  *o3 = header_field(hdr, 5);
+  *o4 = header_field(hdr, 7);
+  *o5 = header_field(hdr, 3);
+  *o6 = header_field(hdr, 4);
+  *o7 = header_field(hdr, 6);
   return 0;
 }
 
@@ -84,17 +84,17 @@ std::int32_t rbslcp(const std::int16_t* hdr, std::int32_t* o1, std::int32_t* o2,
                     std::int32_t* o7, std::int32_t* o8, std::int32_t* o9, std::int32_t* o10,
                     std::int32_t* o11) {
   // Fields 1, 2, 7, 8, 11, 3, 5, 9, 4, 6, 10.
-  *o1 = field(hdr, 1);
-  *o2 = field(hdr, 2);
-  *o3 = field(hdr, 7);
-  *o4 = field(hdr, 8);
-  *o5 = field(hdr, 11);
-  *o6 = field(hdr, 3);
-  *o7 = field(hdr, 5);
-  *o8 = field(hdr, 9);
-  *o9 = field(hdr, 4);
-  *o10 = field(hdr, 6);
-  *o11 = field(hdr, 10);
+  *o1 = header_field(hdr, 1);
+  *o2 = header_field(hdr, 2);
+  *o3 = header_field(hdr, 7);
+  *o4 = header_field(hdr, 8);
+  *o5 = header_field(hdr, 11);
+  *o6 = header_field(hdr, 3);
+  *o7 = header_field(hdr, 5);
+  *o8 = header_field(hdr, 9);
+  *o9 = header_field(hdr, 4);
+  *o10 = header_field(hdr, 6);
+  *o11 = header_field(hdr, 10);
   return 0;
 }
 

@@ -95,7 +95,7 @@ INSTANTIATE_TEST_SUITE_P(
       return s;
     });
 
-TEST(Ynmnmr, MostSpecificAcceptedKindWins) {
+TEST(Ynmnmr, NarrowestAcceptedKindWins) {
   const std::vector<double> id = diagonal({1, 1, 1});
   EXPECT_EQ(answer(3, id, {0x11104, 0x111105}), 2);
   EXPECT_EQ(answer(3, id, {0x1103}), 1);
