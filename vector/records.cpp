@@ -38,6 +38,7 @@ std::int32_t trapnt(const double* a, const std::int32_t* dim, const std::int32_t
                     const std::int32_t* ld, const std::int32_t* nv, const void* /*unused*/,
                     const double* p, double* q) {
   if (*dim != kSpace || *nu < 1 || *nv < 1) return 0;
+  if (*nv > 1 && *ld < 1) return 0;  // rows would start before the grid
   // Row j = 1..nv, then point i = 1..nu; point (i, j) at real ((i-1) + (j-1) ld) dim + 1.
   const std::int64_t rows = *nv, cols = *nu, lead = *ld;
   for (std::int64_t j = 0; j < rows; ++j) {

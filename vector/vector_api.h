@@ -219,7 +219,8 @@ ORVQ7_API int32_t fmat23(const int32_t* n, const int32_t* m, const int32_t* p, c
  *   a       in   real(12)  the transformation
  *   dim     in   int32     reals per point; nothing is done unless dim = 3
  *   nu      in   int32     points per row of the grid; nothing is done when nu < 1
- *   ld      in   int32     leading dimension of the grid, in points
+ *   ld      in   int32     leading dimension of the grid, in points; nothing is done
+ *                          when nv > 1 and ld < 1
  *   nv      in   int32     number of rows; nothing is done when nv < 1
  *   unused  in   any       not read (may be null)
  *   p       in   real      point (i, j), i = 1..nu, j = 1..nv, starts at real

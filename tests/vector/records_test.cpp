@@ -21,6 +21,7 @@ TEST(Trapnt, TransformsTheGridPointsOnlyAndSkipsBadShapes) {
   trapnt(kShift, &two, &nu, &ld, &nv, nullptr, p, p);
   trapnt(kShift, &dim, &zero, &ld, &nv, nullptr, p, p);
   trapnt(kShift, &dim, &nu, &ld, &zero, nullptr, p, p);
+  trapnt(kShift, &dim, &nu, &zero, &nv, nullptr, p, p);
   EXPECT_EQ(p[0], 0.0);  // none of them did anything
 }
 
