@@ -216,9 +216,10 @@ ORVQ7_SYS_API int64_t orvq7sys_table_live_thread(void);
 /** Capacity in entries of a table's storage (>= its number of entries); -1 for an unknown
  * handle. */
 ORVQ7_SYS_API int64_t orvq7sys_table_capacity(int32_t handle);
-/** Fault injection: the calling thread's next n calls of yutini, yutwri, yutmnc or yutcop are
- * refused with 36, changing nothing (n <= 0 cancels). */
-ORVQ7_SYS_API void orvq7sys_table_refuse(int32_t n);
+/** Fault injection: of the calling thread's next calls of yutini, yutwri, yutmnc or yutcop,
+ * the first `skip` go through and the n after them are refused with 36, changing nothing
+ * (n <= 0 cancels). */
+ORVQ7_SYS_API void orvq7sys_table_refuse(int32_t skip, int32_t n);
 
 #ifdef __cplusplus
 }

@@ -37,13 +37,18 @@ std::atomic<std::int64_t> s_live{0};
 
 struct ThreadAccount {
   Counter live = std::make_shared<std::atomic<std::int64_t>>(0);
-  std::int32_t refuse = 0;  // calls that may allocate still to be refused
+  std::int32_t pass = 0;    // calls that may allocate to let through before refusing
+  std::int32_t refuse = 0;  // calls that may allocate still to be refused after those
 };
 thread_local ThreadAccount s_account;
 
 // Fault injection: true when this call (one that may allocate) is to be refused.
 bool injected_refusal() {
   if (s_account.refuse <= 0) return false;
+  if (s_account.pass > 0) {
+    --s_account.pass;
+    return false;
+  }
   --s_account.refuse;
   return true;
 }
@@ -258,6 +263,9 @@ std::int64_t orvq7sys_table_capacity(std::int32_t handle) {
   return t == nullptr ? -1 : t->capacity;
 }
 
-void orvq7sys_table_refuse(std::int32_t n) { s_account.refuse = n > 0 ? n : 0; }
+void orvq7sys_table_refuse(std::int32_t skip, std::int32_t n) {
+  s_account.pass = skip > 0 ? skip : 0;
+  s_account.refuse = n > 0 ? n : 0;
+}
 
 }  // extern "C"

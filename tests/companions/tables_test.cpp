@@ -204,7 +204,7 @@ TEST(Tables, InjectedRefusalsGiveCode36AndChangeNothing) {
   const std::int32_t one = 1, two = 2;
   std::int32_t out = -9, ierr = 0;
   const double v = 3.0;
-  orvq7sys_table_refuse(4);
+  orvq7sys_table_refuse(0, 4);
   EXPECT_EQ(yutini(&one, &one, &out, &ierr), 1);
   EXPECT_EQ(ierr, 36);
   EXPECT_EQ(yutwri(&h, &one, &one, &v, &ierr), 1);
@@ -220,6 +220,11 @@ TEST(Tables, InjectedRefusalsGiveCode36AndChangeNothing) {
   ASSERT_EQ(yutrea(&h, &one, &one, &got, &ierr), 0);
   EXPECT_EQ(bits(got), bits(0.0));
   EXPECT_EQ(yutwri(&h, &one, &one, &v, &ierr), 0);
+  // Skipping: the next call goes through, the one after is refused.
+  orvq7sys_table_refuse(1, 1);
+  EXPECT_EQ(yutmnc(&h, &two, &ierr), 0);
+  EXPECT_EQ(yutmnc(&h, &one, &ierr), 1);
+  EXPECT_EQ(yutmnc(&h, &one, &ierr), 0);
   end_table(h);
   EXPECT_EQ(orvq7sys_table_live_thread(), live0);
 }

@@ -1,10 +1,13 @@
-// tests/path/curves.h -- evaluation routines of known curves for the path tests.
+// tests/path/curves.h -- evaluation routines of known curves, path records and result reading
+// for the path tests.
 #pragma once
 #include <algorithm>
 #include <cstdint>
+#include <cstring>
 #include <vector>
 
-#include "path/path_api.h"
+#include "path/path_state.h"
+#include "support/recording_services.h"
 
 // The system evaluated, its parameter, and what the solver asked of it.
 struct Curve {
@@ -65,4 +68,45 @@ inline std::int32_t eval_curve(void* ctx, const std::int32_t* npts, const double
   }
   *ierr = 0;
   return 0;
+}
+
+// The records of one path, decoded by wnccmd for n unknowns with step bounds
+// (0.001, 0.25) and tolerance 0.01.
+struct PathRecords {
+  PathRecords(std::int32_t n, std::int32_t mode, std::int32_t store, std::int32_t variant = 1)
+      : dim(n) {
+    for (std::int32_t i = 0; i < n; ++i) pas[i] = 0.001, pas[n + i] = 0.25, tol[i] = 0.01;
+    result =
+        wnccmd(&dim, pas, &mode, tol, &store, &variant, &options, limits, &layout, pairs, &ierr);
+  }
+  std::int32_t dim;
+  double pas[40] = {};
+  double tol[20] = {};
+  Orvq7PathOptions options{};
+  double limits[2] = {};
+  Orvq7PathLayout layout{};
+  std::int32_t pairs[22] = {};
+  Orvq7PathMarch march{};
+  Orvq7PathTables tables{};
+  std::int32_t itab = 0;
+  std::int32_t ierr = -1;
+  std::int32_t result = -1;
+};
+
+// The entries of the quantity of a record kind in a result, as raw 8-byte slots (an integer
+// quantity's values are read as int32 from the bytes). count receives the triple's count.
+inline std::vector<unsigned char> read_kind(std::int32_t itab, std::int32_t kind,
+                                            std::int32_t* count) {
+  std::int32_t h = 0, ierr = 0, esize = 0, entries = 0, first = 1;
+  if (yncrea(&itab, &kind, &h, count, &ierr) == 1 || h == 0) return {};
+  if (yutinf(&h, &esize, &entries, &ierr) == 1) return {};
+  std::vector<unsigned char> bytes(static_cast<std::size_t>(esize) * entries);
+  if (yutrea(&h, &first, &entries, bytes.data(), &ierr) == 1) return {};
+  return bytes;
+}
+template <class T>
+T value_at(const std::vector<unsigned char>& bytes, std::size_t k) {
+  T v;
+  std::memcpy(&v, bytes.data() + k * sizeof(T), sizeof(T));
+  return v;
 }
