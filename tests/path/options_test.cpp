@@ -80,7 +80,8 @@ TEST(Wnccmd, ChecksRunInTheirOrder) {
   EXPECT_EQ(decode(2, 3, 0, 1, bad_tol, kPas + 2).ierr, 4718);  // mode before tol
   EXPECT_EQ(decode(2, 4, 0, 1, bad_tol, kPas + 2).ierr, 4712);  // tol before store
   // Per-unknown tolerances: every one must be positive.
-  EXPECT_EQ(decode(2, 4 + kB16, 2, 1, bad_tol + 1, kPas + 2).ierr, 0);
+  const double tol_pair[2] = {0.1, 0.2};
+  EXPECT_EQ(decode(2, 4 + kB16, 2, 1, tol_pair, kPas + 2).ierr, 0);
   const double tol_nan[2] = {0.1, std::nan("")};
   EXPECT_EQ(decode(2, 4 + kB16, 2, 1, tol_nan, kPas + 2).ierr, 4712);
   const double pas_equal[4] = {0.1, 0.01, 0.1, 0.2};  // pas(1,1) = pas(1,2): strict
