@@ -117,7 +117,9 @@ ORVQ7_SYS_API void altver(void);
  * table gains without being written (yutini, yutmnc) are zero-filled.
  * Codes (in ierr, result 1; nothing is changed): 4712 an unknown handle, a size or count out of
  * range, an entry range outside the table, a selector other than 1..4; 36 the storage was
- * refused (no memory, more than 2^40 bytes, or fault injection, below). On success ierr = 0. */
+ * refused (no memory, more than 2^40 bytes, already 2^20 tables live, or fault injection,
+ * below). On success ierr = 0. A released handle stays unknown to every service (it is not
+ * given out again until its slot has served 2048 more tables). */
 
 /** yutini -- creates a table of `entries` zero-filled entries of `esize` bytes.
  *   esize    in   int32  entry size in bytes, >= 1

@@ -8,7 +8,7 @@
 #include <cstring>
 #include <memory>
 #include <mutex>
-#include <unordered_map>
+#include <vector>
 
 #include "companions/data/data_api.h"
 #include "companions/system/system_api.h"
@@ -30,26 +30,47 @@ struct Table {
   Counter owner;                  // the creating thread's live count (may outlive the thread)
 };
 
-std::mutex s_mutex;  // guards s_tables, s_next_handle and the contents of every table
-std::unordered_map<std::int32_t, Table> s_tables;
-std::int32_t s_next_handle = 1;
+// Registry: a handle names slot (handle - 1) mod 2^20 with generation (handle - 1) / 2^20, so
+// a lookup is an index and a released handle stays unknown until its slot has been reused
+// 2048 times. At most 2^20 tables live at once.
+constexpr std::int32_t kSlotBits = 20;
+constexpr std::int32_t kMaxSlots = std::int32_t{1} << kSlotBits;
+constexpr std::int32_t kGenerations = std::int32_t{1} << (31 - kSlotBits);
+
+struct Slot {
+  Table table;
+  std::int32_t generation = 0;
+  bool live = false;
+};
+
+std::mutex s_mutex;  // guards s_slots, s_free and the contents of every table
+std::vector<Slot> s_slots;
+std::vector<std::int32_t> s_free;  // released slots, reused last in, first out
 std::atomic<std::int64_t> s_live{0};
 
+// Per-thread accounting: the live count is shared with the thread's tables, since another
+// thread may release them after this one has ended.
 struct ThreadAccount {
   Counter live = std::make_shared<std::atomic<std::int64_t>>(0);
-  std::int32_t pass = 0;    // calls that may allocate to let through before refusing
-  std::int32_t refuse = 0;  // calls that may allocate still to be refused after those
 };
 thread_local ThreadAccount s_account;
 
+// Per-thread fault injection, constant-initialised (no initialisation guard on the hot path).
+struct Injection {
+  std::int32_t pass = 0;    // calls that may allocate to let through before refusing
+  std::int32_t refuse = 0;  // calls that may allocate still to be refused after those
+};
+thread_local Injection s_injection;
+
 // Fault injection: true when this call (one that may allocate) is to be refused.
 bool injected_refusal() {
-  if (s_account.refuse <= 0) return false;
-  if (s_account.pass > 0) {
-    --s_account.pass;
+  Injection& in = s_injection;
+  if (in.refuse <= 0) return false;
+  if (in.pass > 0) {
+    --in.pass;
     return false;
   }
-  --s_account.refuse;
+  --in.refuse;
   return true;
 }
 
@@ -60,8 +81,12 @@ std::int32_t fail(std::int32_t* ierr, std::int32_t code) {
 
 // The table of a handle, or nullptr. Caller holds s_mutex.
 Table* find(std::int32_t handle) {
-  auto it = s_tables.find(handle);
-  return it == s_tables.end() ? nullptr : &it->second;
+  if (handle < 1) return nullptr;
+  const std::int32_t slot = (handle - 1) & (kMaxSlots - 1);
+  const std::int32_t generation = (handle - 1) >> kSlotBits;
+  if (slot >= static_cast<std::int32_t>(s_slots.size())) return nullptr;
+  Slot& s = s_slots[static_cast<std::size_t>(slot)];
+  return s.live && s.generation == generation ? &s.table : nullptr;
 }
 
 // Makes room for `needed` entries: capacity grows to the larger of needed and twice the old
@@ -107,15 +132,25 @@ std::int32_t create(std::int64_t esize, std::int64_t entries) {
   std::memset(t.data, 0, static_cast<std::size_t>(entries * esize));
   t.entries = entries;
   t.owner = s_account.live;
-  std::int32_t h;
-  do {
-    h = s_next_handle;
-    s_next_handle = (s_next_handle == INT32_MAX) ? 1 : s_next_handle + 1;
-  } while (s_tables.count(h) != 0);
-  s_tables.emplace(h, std::move(t));
+  std::int32_t slot;
+  if (!s_free.empty()) {
+    slot = s_free.back();
+    s_free.pop_back();
+    Slot& reused = s_slots[static_cast<std::size_t>(slot)];
+    reused.generation = (reused.generation + 1) % kGenerations;
+  } else if (static_cast<std::int32_t>(s_slots.size()) < kMaxSlots) {
+    slot = static_cast<std::int32_t>(s_slots.size());
+    s_slots.emplace_back();
+  } else {
+    std::free(t.data);
+    return 0;
+  }
+  Slot& s = s_slots[static_cast<std::size_t>(slot)];
+  s.table = std::move(t);
+  s.live = true;
   s_live.fetch_add(1);
   s_account.live->fetch_add(1);
-  return h;
+  return (s.generation << kSlotBits) + slot + 1;
 }
 
 // Element size in bytes of a selector (the workspace's type codes); 0 when refused.
@@ -227,7 +262,7 @@ std::int32_t yutcop(const std::int32_t* handle, std::int32_t* copy, std::int32_t
   const Table* t = find(*handle);
   if (t == nullptr) return fail(ierr, kErrBadArg);
   const std::int64_t esize = t->esize, entries = t->entries;
-  const std::int32_t h = create(esize, entries);  // may rehash: t is not used after this
+  const std::int32_t h = create(esize, entries);  // may move the slots: t is not used after
   if (h == 0) return fail(ierr, kErrNoMemory);
   const Table* from = find(*handle);
   Table* to = find(h);
@@ -241,10 +276,13 @@ std::int32_t yutend(const std::int32_t* handle, std::int32_t* ierr) {
   Table t;
   {
     std::lock_guard<std::mutex> lock(s_mutex);
-    auto it = s_tables.find(*handle);
-    if (it == s_tables.end()) return fail(ierr, kErrBadArg);
-    t = std::move(it->second);
-    s_tables.erase(it);
+    Table* found = find(*handle);
+    if (found == nullptr) return fail(ierr, kErrBadArg);
+    t = std::move(*found);
+    *found = Table{};
+    const std::int32_t slot = (*handle - 1) & (kMaxSlots - 1);
+    s_slots[static_cast<std::size_t>(slot)].live = false;
+    s_free.push_back(slot);
   }
   std::free(t.data);
   s_live.fetch_sub(1);
@@ -264,8 +302,8 @@ std::int64_t orvq7sys_table_capacity(std::int32_t handle) {
 }
 
 void orvq7sys_table_refuse(std::int32_t skip, std::int32_t n) {
-  s_account.pass = skip > 0 ? skip : 0;
-  s_account.refuse = n > 0 ? n : 0;
+  s_injection.pass = skip > 0 ? skip : 0;
+  s_injection.refuse = n > 0 ? n : 0;
 }
 
 }  // extern "C"
