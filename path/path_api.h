@@ -107,8 +107,9 @@ typedef int32_t (*Orvq7PathFct)(void* ctx, const int32_t* npts, const double* x,
  *   4712  n < 2
  *   4718  n > 20
  *   4712  some pas(i,1) <= 0 or pas(i,1) >= pas(i,2) (or not a number)
- *   4718  mode: no single kind bit before another bit of 0-14, a set bit among 4-14, bit 15
- *         with an order level other than 1, a set bit among 20-31
+ *   4718  mode, scanned from bit 0 up: a set bit among 0-14 other than one first kind bit
+ *         (two kind bits, or any of 4-14), bit 15 with an order level other than 1, a set
+ *         bit among 20-31
  *   4712  tol(1) <= 0, or with mode bit 16 some tol(i) <= 0 (or not a number)
  *   4718  store: no quantity requested; a set bit among 15-29
  *   4718  variant not 1 or 2, or the combination refused by the variant check

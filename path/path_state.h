@@ -57,7 +57,8 @@
 //   treq         wncini (2, or 6 at order level 1)     wnccar
 //
 // Table handles (Orvq7PathTables): master and the sub-table of each slot (0: none); written by
-// wncflu when the result is created, read by wncflu (an end point that replaces the last one).
+// wncflu when the result is created; a copy for the driver (the storage routines work from the
+// triples of the master table itself).
 #pragma once
 #include <cstdint>
 
