@@ -119,9 +119,170 @@ ORVQ7_API int32_t yntrnr(const int32_t* n, const double* v, const int32_t* mode,
  * Matrix inversion and determinant
  * ======================================================================================== */
 
+/** ynmimr -- inverse of a square matrix of order n <= 20 (Gauss-Jordan exchange steps with
+ * complete pivoting).
+ * Arguments (all by reference; "in" arguments are never written)
+ *   n     in   int32      order, n >= 1 (n <= 20 from order 3 on)
+ *   a     in   real(n,n)  the matrix, column-major, leading dimension n
+ *   b     out  real(n,n)  the inverse; b may be the same array as a (not a partial overlap)
+ *   ierr  out  int32      status code, below
+ * Result  0 success, 1 failure (the code is in ierr)
+ *   ierr   result  when                                             outputs
+ *   0      0       success                                          b written
+ *   4712   1       n < 1                                            b untouched
+ *   4703   1       n = 1 and |a| < 1e-15                            b untouched
+ *   4703   1       n = 2 and |a11 a22 - a21 a12| < 1e-30            b untouched
+ *   4718   1       n > 20 (only reached for n >= 3)                 b untouched
+ *   4703   1       n >= 3 and the largest remaining magnitude at    b partly transformed
+ *                  some step is < 1e-15
+ * Method: n = 1: b = 1/a. n = 2: det = a11 a22 - a21 a12; b11 = a22/det, b21 = -a21/det,
+ *   b12 = -a12/det, b22 = a11/det. n >= 3: a is copied to b; at step k = 1..n the pivot is
+ *   the largest magnitude over rows and columns k..n, rows scanned in the outer loop and
+ *   columns in the inner loop, replaced only on a strictly larger magnitude (the first
+ *   maximum in that order wins; a NaN is never taken); whole rows k, r and whole columns
+ *   k, q are exchanged; then with p the pivot: b(i,j) = b(i,j) - (b(i,k) b(k,j)) / p for
+ *   i != k, j != k; b(k,j) = b(k,j) / p; b(i,k) = -b(i,k) / p; b(k,k) = 1 / p. Finally the
+ *   interchanges are undone from k = n down to 1, a row exchange as a column exchange and
+ *   a column exchange as a row exchange.
+ * Traceback: none.  State: none; work arrays are locals.
+ */
+ORVQ7_API int32_t ynmimr(const int32_t* n, const double* a, double* b, int32_t* ierr);
+
+/** ynmxmr -- determinant of a square matrix of order n <= 20.
+ * Arguments (all by reference; "in" arguments are never written)
+ *   n     in   int32      order, 1 <= n <= 20
+ *   a     in   real(n,n)  the matrix, column-major, leading dimension n
+ *   det   out  real       the determinant
+ *   ierr  out  int32      status code, below
+ * Result  0 success, 1 failure (the code is in ierr)
+ *   ierr   result  when          outputs
+ *   0      0       success       det written (a singular matrix gives 0: not an error)
+ *   4712   1       n < 1         det untouched
+ *   4718   1       n > 20        det untouched
+ * Method: n = 1: a11. n = 2: a11 a22 - a21 a12. n = 3: expansion along the first row,
+ *   (a11 (a22 a33 - a23 a32) - a12 (a21 a33 - a23 a31)) + a13 (a21 a32 - a22 a31).
+ *   4 <= n <= 20: elimination on a local copy; at step k the pivot is the largest magnitude
+ *   over rows and columns k..n, columns scanned in the outer loop and rows in the inner
+ *   loop, starting from a candidate of -1 (the element (k,k) is taken first unless it is a
+ *   NaN) and replaced only on a strictly larger magnitude; an exactly zero pivot gives
+ *   det = 0 at once; a row and a column exchange each count one interchange; for i > k:
+ *   f = a(i,k) / p, new = a(i,j) - f a(k,j) for j > k, set to exactly 0 when
+ *   |a(i,j)| * 1e-12 > |new| (strict); det = det * p from det = 1; an odd count of
+ *   interchanges negates det. No singularity threshold.
+ * Traceback: none.  State: none; work arrays are locals.
+ */
+ORVQ7_API int32_t ynmxmr(const int32_t* n, const double* a, double* det, int32_t* ierr);
+
 /* ==========================================================================================
  * Matrix and vector products, transpose and bound widening
  * ======================================================================================== */
+
+/** ynmpmm -- matrix product P = A B.
+ * Arguments (all by reference; "in" arguments are never written)
+ *   m, k, n  in   int32      sizes, each >= 1
+ *   a        in   real(m,k)  leading dimension m
+ *   b        in   real(k,n)  leading dimension k
+ *   p        out  real(m,n)  leading dimension m; must not overlap a or b
+ *   ierr     out  int32      0, or 4712 when m, k or n is below 1 (p untouched)
+ * Result 0 success, 1 failure. Each P(i,j) = A(i,1) B(1,j) + A(i,2) B(2,j) + ... + A(i,k) B(k,j),
+ *   accumulated left to right.
+ * Traceback: none.  State: none.
+ */
+ORVQ7_API int32_t ynmpmm(const int32_t* m, const int32_t* k, const int32_t* n, const double* a,
+                         const double* b, double* p, int32_t* ierr);
+
+/** ynmpmv -- matrix-vector product y = A x.
+ * Arguments (all by reference; "in" arguments are never written)
+ *   m, n  in   int32      sizes, each >= 1
+ *   a     in   real(m,n)  leading dimension m
+ *   x     in   real(n)
+ *   y     out  real(m)    must not overlap a or x
+ *   ierr  out  int32      0, or 4712 when m or n is below 1 (y untouched)
+ * Result 0 success, 1 failure. y(i) = A(i,1) x(1) + ... + A(i,n) x(n), left to right.
+ * Traceback: none.  State: none.
+ */
+ORVQ7_API int32_t ynmpmv(const int32_t* m, const int32_t* n, const double* a, const double* x,
+                         double* y, int32_t* ierr);
+
+/** ynmrmm -- transpose: B(j,i) = A(i,j).
+ * Arguments (all by reference; "in" arguments are never written)
+ *   m, n  in   int32      sizes, each >= 1
+ *   a     in   real(m,n)  leading dimension m
+ *   b     out  real(n,m)  leading dimension n; must not overlap a
+ *   ierr  out  int32      0, or 4712 when m or n is below 1 (b untouched)
+ * Result 0 success, 1 failure.  Traceback: none.  State: none.
+ */
+ORVQ7_API int32_t ynmrmm(const int32_t* m, const int32_t* n, const double* a, double* b,
+                         int32_t* ierr);
+
+/** ynmtvv -- widens a pair of bound vectors by margins and checks that no pair crosses.
+ * Arguments (all by reference; "in" arguments are never written)
+ *   n     in   int32    dimension, n >= 1
+ *   x     in   real(2n) the n lower bounds, then the n upper bounds
+ *   d     in   real(n)  margins; negative margins shrink the bounds
+ *   y     out  real(2n) y(i) = x(i) - d(i), y(n+i) = x(n+i) + d(i); y may be x
+ *   ierr  out  int32    status code, below
+ * Result  0 success, 1 failure (the code is in ierr)
+ *   ierr   result  when                                   outputs
+ *   0      0       success (equal bounds are accepted)    y written
+ *   4712   1       n < 1                                  y untouched
+ *   4712   1       for the first i in increasing order,   y(1..i) and y(n+1..n+i) written,
+ *                  y(i) > y(n+i) (strict)                 later components untouched
+ * A NaN bound never counts as crossing.  Traceback: none.  State: none.
+ */
+ORVQ7_API int32_t ynmtvv(const int32_t* n, const double* x, const double* d, double* y,
+                         int32_t* ierr);
+
+/** ynvpvv -- scalar product s = u(1) v(1) + ... + u(n) v(n), added left to right from the
+ * first term (a single term -0 stays -0).
+ * Arguments (all by reference; "in" arguments are never written)
+ *   n     in   int32    dimension, n >= 1
+ *   u, v  in   real(n)
+ *   s     out  real     the product
+ *   ierr  out  int32    0, or 4712 when n < 1 (s untouched)
+ * Result 0 success, 1 failure.  Traceback: none.  State: none.
+ */
+ORVQ7_API int32_t ynvpvv(const int32_t* n, const double* u, const double* v, double* s,
+                         int32_t* ierr);
+
+/** ynvevv -- exterior (wedge) product of two vectors.
+ * Arguments (all by reference; "in" arguments are never written)
+ *   n     in   int32           dimension, n >= 2
+ *   u, v  in   real(n)
+ *   w     out  real(n(n-1)/2)  u(i) v(j) - u(j) v(i) for the pairs i < j in lexicographic
+ *                              order (1,2), (1,3), ..., (1,n), (2,3), ..., (n-1,n); for n = 3
+ *                              this is not the cross product (order and middle sign differ);
+ *                              must not overlap u or v
+ *   ierr  out  int32           0, or 4712 when n < 2 (w untouched)
+ * Result 0 success, 1 failure.  Traceback: none.  State: none.
+ */
+ORVQ7_API int32_t ynvevv(const int32_t* n, const double* u, const double* v, double* w,
+                         int32_t* ierr);
+
+/** ynvvvv -- generalised vector product: the vector orthogonal to the n-1 columns of A.
+ * Arguments (all by reference; "in" arguments are never written)
+ *   n     in   int32         dimension, n >= 2
+ *   a     in   real(n,n-1)   the n-1 vectors as columns, leading dimension n
+ *   w     out  real(n)       not normalised: its length is the (n-1)-volume of the columns,
+ *                            zero when they are dependent; must not overlap a
+ *   ierr  out  int32         status code, below
+ * Method: n = 2: w = (-a21, a11), the column turned a quarter turn counter-clockwise, so
+ *   w . x = det[a x]. n = 3: the cross product (a2 b3 - a3 b2, a3 b1 - a1 b3, a1 b2 - a2 b1).
+ *   n >= 4: w(i) = (-1)^(i+1) det(A without row i), so w . x = det[x a(1) ... a(n-1)] (for
+ *   n = 2 the rule above has the opposite sign, on purpose). n = 4: each minor expanded along
+ *   its first row as in ynmxmr of order 3. 5 <= n <= 21: each minor's determinant by ynmxmr,
+ *   in a local square up to n = 10 and in a workspace block of (n-1)^2 reals (type 3,
+ *   relative to dynar, released on every path out) from n = 11.
+ * Result  0 success, 1 failure (the code is in ierr)
+ *   ierr   result  when                                               outputs
+ *   0      0       success                                            w written
+ *   4712   1       n < 2                                              w untouched
+ *   4718   1       n > 21 (the minors exceed ynmxmr's capacity;       w untouched
+ *                  decided at once, no workspace is asked for)
+ *   36     1       n >= 11 and the workspace refused the block        w untouched
+ * Traceback: none.  State: none.
+ */
+ORVQ7_API int32_t ynvvvv(const int32_t* n, const double* a, double* w, int32_t* ierr);
 
 /* ==========================================================================================
  * Classification of linear maps

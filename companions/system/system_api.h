@@ -119,6 +119,68 @@ ORVQ7_SYS_API void altver(void);
  * Growable tables (result tables of traced paths)
  * ---------------------------------------------------------------------------------------- */
 
+/* A table is a sequence of entries of one fixed size in bytes, named by a handle (a positive
+ * integer, 0 is never a handle). Entries are counted from 1. Tables are process-wide: a handle
+ * made on one thread may be used and released on another. Every service locks one mutex for its
+ * whole work, so calls on different tables, or reads of one table, may run concurrently; the
+ * caller serialises writes to a table against other uses of that table. The storage grows
+ * geometrically (its capacity at least doubles when it must grow), so appending entries one at
+ * a time costs amortised constant time per entry; shrinking keeps the capacity. Entries that a
+ * table gains without being written (yutini, yutmnc) are zero-filled.
+ * Codes (in ierr, result 1; nothing is changed): 4712 an unknown handle, a size or count out of
+ * range, an entry range outside the table, a selector other than 1..4; 36 the storage was
+ * refused (no memory, more than 2^40 bytes, already 2^20 tables live, or fault injection,
+ * below). On success ierr = 0. A released handle stays unknown to every service (it is not
+ * given out again until its slot has served 2048 more tables). */
+
+/** yutini -- creates a table of `entries` zero-filled entries of `esize` bytes.
+ *   esize    in   int32  entry size in bytes, >= 1
+ *   entries  in   int32  number of entries, >= 0
+ *   handle   out  int32  the new table's handle (written only on success) */
+ORVQ7_SYS_API int32_t yutini(const int32_t* esize, const int32_t* entries, int32_t* handle,
+                             int32_t* ierr);
+
+/** yutwri -- writes `count` entries from `values`, starting at entry `first`. The range must
+ * start within the table or right after its last entry (1 <= first <= entries + 1, count >= 0);
+ * the table grows to hold first + count - 1 entries when needed.
+ *   values   in   bytes(count * esize)  the entries, one after another */
+ORVQ7_SYS_API int32_t yutwri(const int32_t* handle, const int32_t* first, const int32_t* count,
+                             const void* values, int32_t* ierr);
+
+/** yutrea -- reads `count` entries starting at entry `first` into `values`
+ * (1 <= first, count >= 0, first + count - 1 <= entries).
+ *   values   out  bytes(count * esize) */
+ORVQ7_SYS_API int32_t yutrea(const int32_t* handle, const int32_t* first, const int32_t* count,
+                             void* values, int32_t* ierr);
+
+/** yutinf -- describes a table: `esize` receives its entry size in bytes and `entries` its
+ * current number of entries. */
+ORVQ7_SYS_API int32_t yutinf(const int32_t* handle, int32_t* esize, int32_t* entries,
+                             int32_t* ierr);
+
+/** yutmnc -- sets the number of entries to `entries` (>= 0): entries added are zero-filled,
+ * entries removed are forgotten (the capacity is kept). */
+ORVQ7_SYS_API int32_t yutmnc(const int32_t* handle, const int32_t* entries, int32_t* ierr);
+
+/** yuttab -- direct access to a table's storage.
+ *   selector  in   int32  unit of the index, the workspace's type codes: 1 byte, 2 4-byte
+ *                         integer, 3 8-byte real, 4 16-byte pair of reals
+ *   index     out  int64  byte (or integer, real, pair) k of the storage, k from 1, is element
+ *                         index + k - 1 of dynar counted from 1 in units of the selector
+ *   entries   out  int32  the current number of entries (the storage holds entries * esize
+ *                         bytes in use, entry j starting at byte (j - 1) * esize + 1)
+ * The storage is 16-byte aligned. It stays where it is until the table grows past its capacity
+ * (yutwri, yutmnc) or is released; the index must not be used after that. */
+ORVQ7_SYS_API int32_t yuttab(const int32_t* handle, const int32_t* selector, int64_t* index,
+                             int32_t* entries, int32_t* ierr);
+
+/** yutcop -- creates a new table with the entry size and the entries of table `handle`;
+ * `copy` receives the new handle (written only on success). */
+ORVQ7_SYS_API int32_t yutcop(const int32_t* handle, int32_t* copy, int32_t* ierr);
+
+/** yutend -- releases a table; its handle is then unknown. */
+ORVQ7_SYS_API int32_t yutend(const int32_t* handle, int32_t* ierr);
+
 /* ------------------------------------------------------------------------------------------
  * Query interface of this implementation (hosts and tests)
  * ---------------------------------------------------------------------------------------- */
@@ -160,6 +222,18 @@ ORVQ7_SYS_API int64_t orvq7sys_ws_outstanding_thread(void);
 ORVQ7_SYS_API int64_t orvq7sys_ws_requests_thread(void);
 /** Fault injection: the calling thread's next n requests are refused (n <= 0 cancels). */
 ORVQ7_SYS_API void orvq7sys_ws_refuse(int32_t n);
+
+/** Growable tables not yet released, in the whole process. */
+ORVQ7_SYS_API int64_t orvq7sys_table_live(void);
+/** Tables created by the calling thread and not yet released (by any thread). */
+ORVQ7_SYS_API int64_t orvq7sys_table_live_thread(void);
+/** Capacity in entries of a table's storage (>= its number of entries); -1 for an unknown
+ * handle. */
+ORVQ7_SYS_API int64_t orvq7sys_table_capacity(int32_t handle);
+/** Fault injection: of the calling thread's next calls of yutini, yutwri, yutmnc or yutcop,
+ * the first `skip` go through and the n after them are refused with 36, changing nothing
+ * (n <= 0 cancels). */
+ORVQ7_SYS_API void orvq7sys_table_refuse(int32_t skip, int32_t n);
 
 #ifdef __cplusplus
 }

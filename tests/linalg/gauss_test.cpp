@@ -3,32 +3,16 @@
 
 #include <cmath>
 #include <cstdint>
-#include <cstdlib>
 #include <limits>
 #include <random>
 #include <vector>
 
 #include "linalg/linalg_api.h"
+#include "linalg_reference.h"
 #include "support/recording_services.h"
 
 namespace {
-
 const double kNaN = std::numeric_limits<double>::quiet_NaN();
-
-// Seed of the randomized checks: ORVQ7_SEED from the environment, else a fixed value.
-std::uint64_t test_seed() {
-  const char* s = std::getenv("ORVQ7_SEED");
-  return s ? std::strtoull(s, nullptr, 10) : 20240611u;
-}
-
-// Column-major copy of a matrix written by rows.
-std::vector<double> by_columns(std::int32_t n, std::initializer_list<double> rows) {
-  std::vector<double> r(rows), c(rows.size());
-  for (std::int32_t i = 0; i < n; ++i)
-    for (std::int32_t j = 0; j < n; ++j) c[i + j * n] = r[i * n + j];
-  return c;
-}
-
 }  // namespace
 
 // ---------------------------------------------------------------------------------------
