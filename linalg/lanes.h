@@ -3,7 +3,6 @@
 // combines with another, so results are bit-identical to the scalar loops they replace.
 #pragma once
 #include <cstdint>
-#include <cstring>
 #if defined(__SSE2__)
 #include <emmintrin.h>
 #endif
@@ -13,12 +12,11 @@ namespace impl {
 using Lanes = double __attribute__((vector_size(16)));
 using LaneMask = std::int64_t __attribute__((vector_size(16)));
 
-inline Lanes load_lanes(const double* p) {
-  Lanes v;
-  std::memcpy(&v, p, sizeof v);
-  return v;
-}
-inline void store_lanes(double* p, Lanes v) { std::memcpy(p, &v, sizeof v); }
+// Unaligned access to two consecutive reals. The vector type aliases double only (unlike a
+// byte copy, which could alias anything and would force every other value to be reloaded).
+using LanesAt = double __attribute__((vector_size(16), aligned(8)));
+inline Lanes load_lanes(const double* p) { return *reinterpret_cast<const LanesAt*>(p); }
+inline void store_lanes(double* p, Lanes v) { *reinterpret_cast<LanesAt*>(p) = v; }
 inline Lanes splat(double x) { return Lanes{x, x}; }
 inline LaneMask as_mask(Lanes v) { return __builtin_bit_cast(LaneMask, v); }
 inline Lanes as_lanes(LaneMask m) { return __builtin_bit_cast(Lanes, m); }
