@@ -203,28 +203,46 @@ double mxmr_eliminate(std::ptrdiff_t n, const double* a) {
     });
     if (odd < ld) factor[odd] = W(odd, k) / p;
     const Lanes cancel = impl::splat(kMxmrCancel);
-    steps<N>(k + 1, ld, [&](std::ptrdiff_t j) {
-      const Lanes akj = impl::splat(W(k, j));
-      Lanes most = impl::splat(-1.0);
-      steps<N, 2>(k + 1, ld, [&](std::ptrdiff_t i) {
-        double* cell = &W(i, j);
-        const Lanes old = impl::load_lanes(cell);
-        const Lanes fresh = old - impl::load_lanes(factor + i) * akj;
-        const Lanes kept = impl::select_lanes(impl::abs_lanes(old) * cancel > impl::abs_lanes(fresh),
-                                              impl::splat(0.0), fresh);
-        impl::store_lanes(cell, kept);
-        most = impl::keep_larger(most, impl::abs_lanes(kept));
-      });
+    auto update = [&](double* cell, Lanes f, Lanes akj, Lanes& most) {
+      const Lanes old = impl::load_lanes(cell);
+      const Lanes fresh = old - f * akj;
+      const Lanes kept = impl::select_lanes(impl::abs_lanes(old) * cancel > impl::abs_lanes(fresh),
+                                            impl::splat(0.0), fresh);
+      impl::store_lanes(cell, kept);
+      most = impl::keep_larger(most, impl::abs_lanes(kept));
+    };
+    // The odd last row of column j, then the column's maximum.
+    auto finish = [&](std::ptrdiff_t j, Lanes most) {
       double m = reduce(most);
       if (odd < ld) {
         const double old = W(odd, j);
-        const double fresh = old - factor[odd] * akj[0];
+        const double fresh = old - factor[odd] * W(k, j);
         const double kept = std::fabs(old) * kMxmrCancel > std::fabs(fresh) ? 0.0 : fresh;
         W(odd, j) = kept;
         m = std::fabs(kept) > m ? std::fabs(kept) : m;
       }
       col_max[j] = m;
+    };
+    // Two columns at a time, two rows at a time.
+    const std::ptrdiff_t last_col = steps<N, 2>(k + 1, ld, [&](std::ptrdiff_t j) {
+      const Lanes akj0 = impl::splat(W(k, j)), akj1 = impl::splat(W(k, j + 1));
+      Lanes most0 = impl::splat(-1.0), most1 = most0;
+      steps<N, 2>(k + 1, ld, [&](std::ptrdiff_t i) {
+        const Lanes f = impl::load_lanes(factor + i);
+        update(&W(i, j), f, akj0, most0);
+        update(&W(i, j + 1), f, akj1, most1);
+      });
+      finish(j, most0);
+      finish(j + 1, most1);
     });
+    if (last_col < ld) {
+      const Lanes akj = impl::splat(W(k, last_col));
+      Lanes most = impl::splat(-1.0);
+      steps<N, 2>(k + 1, ld, [&](std::ptrdiff_t i) {
+        update(&W(i, last_col), impl::load_lanes(factor + i), akj, most);
+      });
+      finish(last_col, most);
+    }
     // (3.5)
     det = det * p;
   });
