@@ -1,31 +1,43 @@
 // tests/linalg/plain_elimination.h -- line-by-line transcriptions of the three elimination
-// algorithms (solve, invert, determinant), written for clarity only. The library's versions
-// are restructured for speed and must agree with these to the bit. Column-major, order
-// 1 <= n <= 20 (3 <= n for the inverse, 4 <= n for the determinant); results 0 or 1 as in the
-// library, outputs written on success only.
+// algorithms, written for clarity only; the library's versions are restructured for speed and
+// must agree with these to the bit. Column-major, order n <= 20 (n >= 3 for the inverse,
+// n >= 4 for the determinant); result 0 or 1, outputs written on success only.
 #pragma once
 #include <cmath>
-#include <cstdint>
 #include <utility>
 #include <vector>
 
 namespace plain {
 
+// Complete pivot over rows and columns k..n-1, strictly larger replaces, from `start`.
+inline double search(std::vector<double>& a, int n, int k, bool rows_outer, double start,
+                     int* r, int* q) {
+  double big = start;
+  *r = *q = k;
+  for (int u = k; u < n; ++u)
+    for (int v = k; v < n; ++v) {
+      const int i = rows_outer ? u : v, j = rows_outer ? v : u;
+      if (std::fabs(a[i + j * n]) > big) big = std::fabs(a[i + j * n]), *r = i, *q = j;
+    }
+  return big;
+}
+inline void swap_rows(std::vector<double>& a, int n, int r1, int r2, int from) {
+  for (int j = from; j < n; ++j) std::swap(a[r1 + j * n], a[r2 + j * n]);
+}
+inline void swap_cols(std::vector<double>& a, int n, int c1, int c2, int from) {
+  for (int i = from; i < n; ++i) std::swap(a[i + c1 * n], a[i + c2 * n]);
+}
+
 inline int solve(int n, const double* a0, const double* b0, double* x) {
-  std::vector<double> a(a0, a0 + n * n), b(b0, b0 + n);
+  std::vector<double> a(a0, a0 + n * n), b(b0, b0 + n), y(n);
   std::vector<int> perm(n);
-  auto A = [&](int i, int j) -> double& { return a[i + j * n]; };
   for (int j = 0; j < n; ++j) perm[j] = j;
-  for (int k = 0; k < n - 1; ++k) {
-    double big = 0;
-    int r = k, q = k;
-    for (int i = k; i < n; ++i)
-      for (int j = k; j < n; ++j)
-        if (std::fabs(A(i, j)) > big) big = std::fabs(A(i, j)), r = i, q = j;
-    if (big <= 1e-38) return 1;
-    for (int j = k; j < n; ++j) std::swap(A(k, j), A(r, j));
+  auto A = [&](int i, int j) -> double& { return a[i + j * n]; };
+  for (int k = 0, r, q; k < n - 1; ++k) {
+    if (search(a, n, k, true, 0.0, &r, &q) <= 1e-38) return 1;
+    swap_rows(a, n, k, r, k);
     std::swap(b[k], b[r]);
-    for (int i = 0; i < n; ++i) std::swap(A(i, k), A(i, q));
+    swap_cols(a, n, k, q, 0);
     std::swap(perm[k], perm[q]);
     for (int i = k + 1; i < n; ++i) {
       const double f = A(i, k) / A(k, k);
@@ -34,7 +46,6 @@ inline int solve(int n, const double* a0, const double* b0, double* x) {
     }
   }
   if (std::fabs(A(n - 1, n - 1)) <= 1e-30) return 1;
-  std::vector<double> y(n);
   y[n - 1] = b[n - 1] / A(n - 1, n - 1);
   for (int i = n - 2; i >= 0; --i) {
     double s = A(i, i + 1) * y[i + 1];
@@ -50,16 +61,9 @@ inline int invert(int n, const double* a, double* out) {
   std::vector<int> rows(n), cols(n);
   auto B = [&](int i, int j) -> double& { return b[i + j * n]; };
   for (int k = 0; k < n; ++k) {
-    double big = 0;
-    int r = k, q = k;
-    for (int i = k; i < n; ++i)
-      for (int j = k; j < n; ++j)
-        if (std::fabs(B(i, j)) > big) big = std::fabs(B(i, j)), r = i, q = j;
-    if (big < 1e-15) return 1;
-    for (int j = 0; j < n; ++j) std::swap(B(k, j), B(r, j));
-    for (int i = 0; i < n; ++i) std::swap(B(i, k), B(i, q));
-    rows[k] = r;
-    cols[k] = q;
+    if (search(b, n, k, true, 0.0, &rows[k], &cols[k]) < 1e-15) return 1;
+    swap_rows(b, n, k, rows[k], 0);
+    swap_cols(b, n, k, cols[k], 0);
     const double p = B(k, k);
     for (int i = 0; i < n; ++i)
       for (int j = 0; j < n; ++j)
@@ -71,8 +75,8 @@ inline int invert(int n, const double* a, double* out) {
     B(k, k) = 1.0 / p;
   }
   for (int k = n - 1; k >= 0; --k) {
-    for (int i = 0; i < n; ++i) std::swap(B(i, k), B(i, rows[k]));
-    for (int j = 0; j < n; ++j) std::swap(B(k, j), B(cols[k], j));
+    swap_cols(b, n, k, rows[k], 0);
+    swap_rows(b, n, k, cols[k], 0);
   }
   for (int e = 0; e < n * n; ++e) out[e] = b[e];
   return 0;
@@ -83,26 +87,20 @@ inline double determinant(int n, const double* a0) {
   auto A = [&](int i, int j) -> double& { return a[i + j * n]; };
   double det = 1;
   int swaps = 0;
-  for (int k = 0; k < n; ++k) {
-    double big = -1;
-    int r = k, q = k;
-    for (int j = k; j < n; ++j)
-      for (int i = k; i < n; ++i)
-        if (std::fabs(A(i, j)) > big) big = std::fabs(A(i, j)), r = i, q = j;
+  for (int k = 0, r, q; k < n; ++k) {
+    search(a, n, k, false, -1.0, &r, &q);
     if (A(r, q) == 0) return 0;
-    if (r != k) ++swaps;
-    if (q != k) ++swaps;
-    for (int j = 0; j < n; ++j) std::swap(A(k, j), A(r, j));
-    for (int i = 0; i < n; ++i) std::swap(A(i, k), A(i, q));
-    const double p = A(k, k);
+    swaps += (r != k) + (q != k);
+    swap_rows(a, n, k, r, 0);
+    swap_cols(a, n, k, q, 0);
     for (int i = k + 1; i < n; ++i) {
-      const double f = A(i, k) / p;
+      const double f = A(i, k) / A(k, k);
       for (int j = k + 1; j < n; ++j) {
         const double v = A(i, j) - f * A(k, j);
         A(i, j) = std::fabs(A(i, j)) * 1e-12 > std::fabs(v) ? 0.0 : v;
       }
     }
-    det = det * p;
+    det = det * A(k, k);
   }
   return swaps % 2 ? -det : det;
 }
