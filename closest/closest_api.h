@@ -11,7 +11,69 @@ ORVQ7_BEGIN_DECLS
 
 /* ==========================================================================================
  * Closest points and distances
+ *
+ * Family conventions (every routine below):
+ *   - Points of dimension n are n reals; a segment is an (n, 2) array of its two end points
+ *     as columns, P(t) = (1 - t) P1 + t P2 for t in [0, 1]; a set of m points is an (n, m)
+ *     array, point j in column j. Indices returned count from 1.
+ *   - Distances are squared distances; no square root is taken except the one of ynoaod.
+ *   - Every sum over components starts from the first term (no leading zero, so a sum of
+ *     -0 terms stays -0) and adds the others by increasing index; each term is rounded before
+ *     it is added. Products are never fused.
+ *   - Thresholds are absolute and fixed: 1e-15 (degenerate squared length, inclusive; snap
+ *     band of ynoall) and 1e-12 (parallel test, strict).
+ *   - No traceback frame is recorded and no workspace is taken. No routine keeps anything
+ *     between calls, so all are safe to call from several threads at once on distinct
+ *     outputs.
+ *   - Outputs may not overlap inputs unless the routine's block allows it.
  * ======================================================================================== */
+
+/** ynoall -- closest pair of points of two segments in dimension n.
+ * Arguments (all by reference; "in" arguments are never written)
+ *   n      in   int32       dimension, n >= 2
+ *   seg1   in   real(n,2)   segment 1: P1, P2 as columns
+ *   seg2   in   real(n,2)   segment 2: Q1, Q2 as columns
+ *   dist2  out  real        |P(t1) - Q(t2)|^2, or the end-point distance of the fallback
+ *   t1     out  real        parameter on segment 1
+ *   t2     out  real        parameter on segment 2
+ *   ierr   out  int32      status code, below
+ * Result  0 success, 1 failure (the code is in ierr)
+ *   ierr   result  when                                           outputs
+ *   0      0       a unique closest pair                          dist2, t1, t2 written
+ *   4712   1       n < 2                                          all untouched
+ *   4717   1       a segment is degenerate (squared length        dist2, t1, t2 written with a
+ *                  <= 1e-15) or the segments are parallel and     representative pair (usable)
+ *                  their projections overlap
+ * Method, with d1 = P2 - P1, d2 = Q2 - Q1, w = P1 - Q1, S1 = |d1|^2, S2 = |d2|^2, b = d1.d2,
+ * d = d2.w, e = d1.w:
+ *   (1) Degenerate when S2 <= 1e-15 or S1 <= 1e-15: both give t1 = t2 = 0.5; only segment 2
+ *       gives t2 = 0.5, t1 = ((Q1 + Q2)/2 - P1).d1 / S1 clamped to [0, 1] (raised to 0 first,
+ *       then lowered to 1); only segment 1 the same with the roles exchanged.
+ *   (2) X = |d1 x d2|^2: n = 2 the square of d1x d2y - d1y d2x; n = 3 (c1^2 + c2^2) + c3^2 of
+ *       the vector product c = (d1y d2z - d1z d2y, d1z d2x - d1x d2z, d1x d2y - d1y d2x);
+ *       n >= 4 the sum of (d1i d2j - d1j d2i)^2 over the pairs i < j, i the outer index, both
+ *       increasing. Parallel when |X| < (1e-12 S2) S1 (strict).
+ *   (3) Parallel: end points projected, tP1 = d2.(P1 - Q1)/S2, tP2 = d2.(P2 - Q1)/S2,
+ *       sQ1 = d1.(Q1 - P1)/S1, sQ2 = d1.(Q2 - P1)/S1; the upper projection is sQ2 when
+ *       sQ2 >= sQ1 (ties make Q2 the upper end). Segment 2 wholly before P1 (upper <= 0) gives
+ *       t1 = 0 and t2 at its upper end; wholly beyond P2 (lower >= 1) gives t1 = 1 and t2 at
+ *       its lower end, both with code 0; otherwise the middle of the overlap with code 4717.
+ *   (4) Lines: n = 2, 3: t1 = ((d2 x w).(d1 x d2))/X, t2 = ((d1 x w).(d1 x d2))/X, each then
+ *       snapped to exactly 0 when |t| <= 1e-15, else to exactly 1 when |1 - t| <= 1e-15.
+ *       n >= 4: t1 = (b d - S2 e)/X, t2 = (S1 d - b e)/X, never snapped.
+ *   (5) Both in [0, 1] (inclusive): that pair. Otherwise the edges and corners of the square
+ *       are tried in a fixed order (edge t1 = 0 or its corner (0, 1); corner (0, 0); edge
+ *       t1 = 1 or corner (1, 1); corner (1, 0); edge t2 = 0 or corner (0, 0); corner (1, 0)
+ *       again; edge t2 = 1 or corner (0, 1); corner (1, 1)), the first whose optimality test
+ *       holds giving the answer. When none holds (rounding, or NaN input) the nearest of the
+ *       end-point pairs (0,0), (0,1), (1,0), (1,1) is taken, a later pair only when strictly
+ *       nearer, and dist2 is that pair's |end - end|^2.
+ *   (6) dist2 = sum of (((1 - t1) P1i + t1 P2i) - (1 - t2) Q1i) - t2 Q2i, squared.
+ * Traceback: none.  State: none; safe on distinct arguments. The input values of t1, t2 are
+ * never read.
+ */
+ORVQ7_API int32_t ynoall(const int32_t* n, const double* seg1, const double* seg2, double* dist2,
+                         double* t1, double* t2, int32_t* ierr);
 
 ORVQ7_END_DECLS
 
