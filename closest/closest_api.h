@@ -75,6 +75,67 @@ ORVQ7_BEGIN_DECLS
 ORVQ7_API int32_t ynoall(const int32_t* n, const double* seg1, const double* seg2, double* dist2,
                          double* t1, double* t2, int32_t* ierr);
 
+/** ynoaot -- projection of a point on an affine subspace: frame coordinates and squared
+ * distance.
+ * Arguments (all by reference)
+ *   n      in   int32      dimension of the space, n >= 1
+ *   k      in   int32      number of directions, 0 <= k <= n
+ *   x      in   real(n)    the point X
+ *   y      in   real(n)    origin Y of the subspace
+ *   u      in   real(n,k)  directions as columns, expected orthonormal (not checked: with
+ *                          another frame the results are the plain dot products below)
+ *   dist2  out  real       squared distance from X to the subspace, sum over i of r_i^2 with
+ *                          r_i = (((Xi - Yi) - c1 U(i,1)) - c2 U(i,2)) ... - ck U(i,k);
+ *                          k = 0 gives |X - Y|^2
+ *   c      out  real(k)    c_j = sum over i of (Xi - Yi) U(i,j); untouched when k = 0
+ *   ierr   out  int32      status code, below
+ * Result  0 success, 1 failure
+ *   ierr   result  when                      outputs
+ *   0      0       success                   dist2, c written
+ *   4712   1       n <= 0, k < 0 or k > n    dist2, c untouched
+ * Traceback: none.  State: none. c may not overlap x, y or u.
+ */
+ORVQ7_API int32_t ynoaot(const int32_t* n, const int32_t* k, const double* x, const double* y,
+                         const double* u, double* dist2, double* c, int32_t* ierr);
+
+/** ynraoo -- point of an affine frame from its coordinates: x = Y + sum of c_j U(:, j).
+ * Arguments (all by reference)
+ *   n      in   int32      dimension, n >= 1
+ *   k      in   int32      number of directions, 0 <= k <= n
+ *   c      in   real(k)    coordinates
+ *   y      in   real(n)    origin Y
+ *   u      in   real(n,k)  directions as columns
+ *   x      out  real(n)    x_i = ((Yi + c1 U(i,1)) + c2 U(i,2)) ... + ck U(i,k); k = 0 gives Y
+ *   ierr   out  int32      status code, below
+ * Result  0 success, 1 failure
+ *   ierr   result  when                      outputs
+ *   0      0       success                   x written
+ *   4712   1       n <= 0, k < 0 or k > n    x untouched
+ * Traceback: none.  State: none. x may be the same array as y; it may not overlap c or u.
+ */
+ORVQ7_API int32_t ynraoo(const int32_t* n, const int32_t* k, const double* c, const double* y,
+                         const double* u, double* x, int32_t* ierr);
+
+/** ynjont -- frame coordinates of m points at once.
+ * Arguments (all by reference)
+ *   n       in   int32      dimension, n >= 1
+ *   m       in   int32      number of points, m >= 1
+ *   pts     in   real(n,m)  the points as columns
+ *   k       in   int32      number of directions; not checked: k < 1 writes nothing
+ *   y       in   real(n)    origin Y
+ *   u       in   real(n,k)  directions as columns
+ *   coords  out  real(k,m)  coords(i,j) = sum over l of (P(l,j) - Yl) U(l,i), the sum of
+ *                           ynoaot; column j for point j
+ *   ierr    out  int32      status code, below
+ * Result  0 success, 1 failure
+ *   ierr   result  when               outputs
+ *   0      0       success            coords written (nothing when k < 1)
+ *   4712   1       n <= 0 or m <= 0   coords untouched
+ * Traceback: none.  State: none. coords may not overlap the inputs.
+ */
+ORVQ7_API int32_t ynjont(const int32_t* n, const int32_t* m, const double* pts, const int32_t* k,
+                         const double* y, const double* u, double* coords, int32_t* ierr);
+
 ORVQ7_END_DECLS
 
 #endif /* ORVQ7_CLOSEST_CLOSEST_API_H */
