@@ -136,6 +136,30 @@ ORVQ7_API int32_t ynraoo(const int32_t* n, const int32_t* k, const double* c, co
 ORVQ7_API int32_t ynjont(const int32_t* n, const int32_t* m, const double* pts, const int32_t* k,
                          const double* y, const double* u, double* coords, int32_t* ierr);
 
+/** ynoapl -- nearest point of a segment to a point X, dimension n.
+ * Arguments (all by reference)
+ *   n      in   int32      dimension, n >= 1
+ *   x      in   real(n)    the point X
+ *   seg    in   real(n,2)  the segment S1, S2 as columns; S(t) = S1 + t (S2 - S1)
+ *   dist2  out  real       squared distance from X to S(t)
+ *   t      out  real       parameter of the nearest point
+ *   ierr   out  int32      status code, below
+ * Method, with p = (X - S1).(S2 - S1) and L = |S2 - S1|^2, tested in this order:
+ *   p < 0 (strict)     t = 0, dist2 = |X - S1|^2, code 0 (even for a degenerate segment)
+ *   L <= 1e-15         t = 0.5, dist2 = |X - (S1 + S2)/2|^2, code 4717
+ *   p > L (strict)     t = 1, dist2 = |X - S2|^2, code 0
+ *   otherwise          t = p / L (so p = L gives t = 1 from the division),
+ *                      dist2 = |(S1 + t (S2 - S1)) - X|^2, code 0
+ * Result  0 success, 1 failure
+ *   ierr   result  when                          outputs
+ *   0      0       success                       dist2, t written
+ *   4712   1       n <= 0                        dist2, t untouched
+ *   4717   1       degenerate segment, p >= 0    dist2, t written (the midpoint; usable)
+ * Traceback: none.  State: none.
+ */
+ORVQ7_API int32_t ynoapl(const int32_t* n, const double* x, const double* seg, double* dist2,
+                         double* t, int32_t* ierr);
+
 ORVQ7_END_DECLS
 
 #endif /* ORVQ7_CLOSEST_CLOSEST_API_H */
