@@ -160,6 +160,34 @@ ORVQ7_API int32_t ynjont(const int32_t* n, const int32_t* m, const double* pts, 
 ORVQ7_API int32_t ynoapl(const int32_t* n, const double* x, const double* seg, double* dist2,
                          double* t, int32_t* ierr);
 
+/** ynoal2 -- closest pair of a segment and an infinite line, dimension n.
+ * Arguments (all by reference)
+ *   n      in   int32      dimension, n >= 2
+ *   seg    in   real(n,2)  segment P1, P2 as columns
+ *   line   in   real(n,2)  unit direction U, then a point O of the line; L(s) = O + s U.
+ *                          |U| = 1 is the caller's duty: it is never divided by, so another
+ *                          length scales s and the parallel test
+ *   dist2  out  real       squared distance between P(t) and L(s)
+ *   t      out  real       parameter on the segment, in [0, 1]
+ *   s      out  real       abscissa on the line, unbounded
+ *   ierr   out  int32      status code, below
+ * Method, with d1 = P2 - P1, S1 = |d1|^2, b = d1.U, e = d1.(O - P1), f = U.(O - P1) and
+ * X = the sum of (d1i Uj - d1j Ui)^2 over the pairs i < j (i outer, both increasing):
+ *   S1 <= 1e-15 or |X| < 1e-12 S1 (strict): the midpoint M = (P1 + P2)/2, t = 0.5,
+ *     s = (M - O).U, dist2 = |(M - O) - s U|^2, code 4717.
+ *   Otherwise t = (e - b f)/X, s = (b e - f S1)/X; t in [0, 1] (inclusive) gives
+ *     dist2 = |(((1 - t) P1 + t P2) - O) - s U|^2. t > 1 gives t = 1, s = (P2 - O).U,
+ *     dist2 = |(P2 - O) - s U|^2; any other t (t < 0, and a NaN t) gives t = 0 with P1.
+ * Result  0 success, 1 failure
+ *   ierr   result  when                          outputs
+ *   0      0       a unique closest pair         dist2, t, s written
+ *   4712   1       n < 2                         all untouched
+ *   4717   1       degenerate or parallel        dist2, t, s written (usable)
+ * Traceback: none.  State: none.
+ */
+ORVQ7_API int32_t ynoal2(const int32_t* n, const double* seg, const double* line, double* dist2,
+                         double* t, double* s, int32_t* ierr);
+
 ORVQ7_END_DECLS
 
 #endif /* ORVQ7_CLOSEST_CLOSEST_API_H */
