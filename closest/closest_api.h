@@ -188,6 +188,70 @@ ORVQ7_API int32_t ynoapl(const int32_t* n, const double* x, const double* seg, d
 ORVQ7_API int32_t ynoal2(const int32_t* n, const double* seg, const double* line, double* dist2,
                          double* t, double* s, int32_t* ierr);
 
+/** ynoaon -- nearest of a list of points, or nearest point of the polyline through them.
+ * Arguments (all by reference)
+ *   n      in   int32      dimension, n >= 1
+ *   x      in   real(n)    the point X
+ *   m      in   int32      number of points, m >= 2
+ *   pts    in   real(n,m)  the points as columns; segment k joins points k and k + 1
+ *   mode   in   int32      below 8467: point mode; 8467 or more: polyline mode
+ *   dist2  out  real       smallest squared distance found; 1e60 when no candidate is below it
+ *   index  out  int32      number (from 1) of the nearest point or segment; untouched when no
+ *                          candidate is below 1e60 (only with non-finite input)
+ *   t      out  real       point mode 0; polyline mode the parameter on the nearest segment,
+ *                          0 when no segment is below 1e60
+ *   ierr   out  int32      status code, below
+ * Method: point mode d_j = |P(:,j) - X|^2. Polyline mode, segment k from A = P(:,k) to
+ * B = P(:,k+1), with p = (X - A).(B - A), L = |B - A|^2, tested in this order:
+ *   L <= 1e-15: u = 0.5, d = |(A + B)/2 - X|^2 (a normal candidate, no code)
+ *   p < 0:      u = 0, d = |A - X|^2
+ *   p > L:      u = 1, d = |B - X|^2
+ *   otherwise   u = p / L, d = |(A + u (B - A)) - X|^2
+ * Candidates by increasing number; one is taken only when strictly nearer than the best so
+ * far (start 1e60), so ties keep the lower number. Points with NaN never win.
+ * Result  0 success, 1 failure
+ *   ierr   result  when               outputs
+ *   0      0       success            dist2, t written; index as above
+ *   4712   1       n <= 0 or m < 2    all untouched
+ * Traceback: none.  State: none (the parameter of the best segment is kept per call).
+ */
+ORVQ7_API int32_t ynoaon(const int32_t* n, const double* x, const int32_t* m, const double* pts,
+                         const int32_t* mode, double* dist2, int32_t* index, double* t,
+                         int32_t* ierr);
+
+/** ynoaod -- ynoaon bounded by a squared distance r2, with a box filter around X.
+ * Arguments (all by reference)
+ *   n      in   int32      dimension, n >= 1
+ *   x      in   real(n)    the point X
+ *   m      in   int32      number of points, m >= 2
+ *   pts    in   real(n,m)  the points as columns; segment k joins points k and k + 1
+ *   mode   in   int32      below 8467: point mode; 8467 or more: polyline mode
+ *   r2     in   real       squared distance bound, also the starting best distance
+ *   tol    in   real       margin of the box
+ *   dist2  out  real       best squared distance; r2 when no candidate is strictly below it
+ *   index  out  int32      number (from 1) of the nearest point or segment. When nothing is
+ *                          below r2: point mode leaves index untouched, polyline mode
+ *                          writes 0
+ *   t      out  real       point mode 0; polyline mode as in ynoaon (0 when nothing found)
+ *   ierr   out  int32      status code, below
+ * Box filter, applied before any distance, axis by axis: with h = sqrt(r2) + tol,
+ *   point mode, n = 3:    point j skipped when P(i,j) > Xi + h or P(i,j) < Xi - h on an axis
+ *   point mode, n != 3:   the same test with the squared bound r2 itself as half-width
+ *                         (deliberate: for n != 3 the half-width is r2, not sqrt(r2) + tol)
+ *   polyline mode, any n: segment k skipped when on some axis both end points are > Xi + h,
+ *                         or both are < Xi - h.
+ * Candidates not skipped follow the rules of ynoaon (strict improvement, lower number on
+ * ties). A NaN r2 or tol makes the box accept everything and a NaN r2 finds nothing.
+ * Result  0 success, 1 failure
+ *   ierr   result  when               outputs
+ *   0      0       success            dist2, t written; index as above
+ *   4712   1       n < 1 or m < 2     all untouched
+ * Traceback: none.  State: none (the box and the best segment's parameter are kept per call).
+ */
+ORVQ7_API int32_t ynoaod(const int32_t* n, const double* x, const int32_t* m, const double* pts,
+                         const int32_t* mode, const double* r2, const double* tol, double* dist2,
+                         int32_t* index, double* t, int32_t* ierr);
+
 ORVQ7_END_DECLS
 
 #endif /* ORVQ7_CLOSEST_CLOSEST_API_H */
