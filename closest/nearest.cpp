@@ -137,7 +137,7 @@ typedef std::int64_t M4 __attribute__((vector_size(32)));  // lane masks: 0 or -
 inline V4 splat(double v) { return V4{v, v, v, v}; }
 // Coordinate c of the four consecutive points starting at p (layout x y z x y z ...).
 inline V4 gather3(const double* p, int c) { return V4{p[c], p[c + 3], p[c + 6], p[c + 9]}; }
-inline bool any(M4 m) { return (m[0] | m[1] | m[2] | m[3]) != 0; }
+inline bool any(const M4& m) { return (m[0] | m[1] | m[2] | m[3]) != 0; }
 
 // Lower bound g of |r| on one axis, where r is the coordinate difference (point of the
 // segment) - X that the per-segment rule forms on that axis: alpha = A - X and beta = B - X
@@ -153,7 +153,7 @@ inline bool any(M4 m) { return (m[0] | m[1] | m[2] | m[3]) != 0; }
 constexpr double kSlack = 0x1p-40;
 constexpr double kFloor = 1e-300;
 
-[[gnu::always_inline]] inline V4 axis_gap(V4 alpha, V4 beta) {
+[[gnu::always_inline]] inline V4 axis_gap(const V4& alpha, const V4& beta) {
   const V4 lo = alpha < beta ? alpha : beta;
   const V4 hi = alpha < beta ? beta : alpha;
   const V4 above = lo - (kSlack * hi + kFloor);  // both ends above X
