@@ -5,17 +5,22 @@
 // are examined by increasing number and one is taken only when strictly nearer than the
 // best so far, so ties keep the lower number.
 //
-// Speed (dimension 3): candidates are screened four at a time, never changing a result.
-//   - Point mode computes the four squared distances side by side, each in its own fixed
-//     order ((dx^2 + dy^2) + dz^2), and keeps per lane the strictly smaller distance with
-//     its number; merging the lanes by (distance, number) gives what the sequential scan
-//     gives, since that scan keeps the first number that reaches the smallest distance.
+// Speed (dimension 3, on processors with AVX2; elsewhere the sequential scans): candidates
+// are screened four at a time, never changing a result.
+//   - Point mode computes four squared distances side by side, each in its own fixed order
+//     ((dx^2 + dy^2) + dz^2), and keeps per lane the strictly smaller distance with its
+//     number; merging the lanes by (distance, number) gives what the sequential scan gives,
+//     since that scan keeps the first number that reaches the smallest distance.
 //   - Polyline mode computes for four segments a lower bound of the squared distance that
 //     the per-segment rule would compute, and runs the rule, in order, only for segments
-//     whose bound does not exceed the best so far. See segment_lower_bound.
+//     whose bound does not exceed the best so far (see axis_gap). The bounded search first
+//     applies its box to four points at a time (see boxed_segments3_blocks).
 // No state: everything is per call.
 #include <cmath>
 #include <cstdint>
+#if defined(__x86_64__)
+#include <immintrin.h>
+#endif
 
 #include "closest/closest_api.h"
 #include "closest/closest_internal.h"
@@ -126,18 +131,41 @@ void scan_segments(std::int32_t n, const double* x, const double* pts, std::int6
   }
 }
 
-// ---- Dimension 3, four candidates side by side ----
+// ---- Dimension 3, four candidates side by side, with 256-bit registers ----
+// Compiled for the AVX2 instruction set and chosen at run time when the processor has it;
+// without it the sequential scans above do the same search. Both perform the same
+// operations candidate by candidate, so they give the same results.
 
-// 256-bit values stay inside this file's inlined helpers, so the ABI note about passing
-// them without AVX does not apply.
-#pragma GCC diagnostic ignored "-Wpsabi"
+#if defined(__x86_64__)
+#pragma GCC push_options
+#pragma GCC target("avx2")
+namespace lanes {
+
 typedef double V4 __attribute__((vector_size(32)));
 typedef std::int64_t M4 __attribute__((vector_size(32)));  // lane masks: 0 or -1
 
 inline V4 splat(double v) { return V4{v, v, v, v}; }
-// Coordinate c of the four consecutive points starting at p (layout x y z x y z ...).
-inline V4 gather3(const double* p, int c) { return V4{p[c], p[c + 3], p[c + 6], p[c + 9]}; }
-inline bool any(const M4& m) { return (m[0] | m[1] | m[2] | m[3]) != 0; }
+
+// The coordinates of the four consecutive points at p (layout x y z x y z ...), one vector
+// per axis: three loads, then lanes moved into place.
+struct Points4 {
+  V4 x, y, z;
+};
+[[gnu::always_inline]] inline Points4 load4(const double* p) {
+  V4 r0, r1, r2;  // (x0 y0 z0 x1), (y1 z1 x2 y2), (z2 x3 y3 z3)
+  __builtin_memcpy(&r0, p, sizeof r0);
+  __builtin_memcpy(&r1, p + 4, sizeof r1);
+  __builtin_memcpy(&r2, p + 8, sizeof r2);
+  const V4 tx = __builtin_shuffle(r0, r1, M4{0, 3, 6, 7});
+  const V4 ty = __builtin_shuffle(r0, r1, M4{1, 4, 7, 0});
+  const V4 tz = __builtin_shuffle(r0, r1, M4{2, 5, 0, 0});
+  return {__builtin_shuffle(tx, r2, M4{0, 1, 2, 5}), __builtin_shuffle(ty, r2, M4{0, 1, 2, 6}),
+          __builtin_shuffle(tz, r2, M4{0, 1, 4, 7})};
+}
+// Lanes 1..3 of a, then lane 0 of b: the points one further on.
+[[gnu::always_inline]] inline V4 next_lane(const V4& a, const V4& b) {
+  return __builtin_shuffle(a, b, M4{1, 2, 3, 4});
+}
 
 // Lower bound g of |r| on one axis, where r is the coordinate difference (point of the
 // segment) - X that the per-segment rule forms on that axis: alpha = A - X and beta = B - X
@@ -162,13 +190,7 @@ constexpr double kFloor = 1e-300;
   return g > 0.0 ? g : splat(0.0);
 }
 
-[[gnu::always_inline]] inline V4 segment_lower_bound(const double* x, const double* a) {
-  const double* b = a + 3;
-  const V4 gx = axis_gap(gather3(a, 0) - x[0], gather3(b, 0) - x[0]);
-  const V4 gy = axis_gap(gather3(a, 1) - x[1], gather3(b, 1) - x[1]);
-  const V4 gz = axis_gap(gather3(a, 2) - x[2], gather3(b, 2) - x[2]);
-  return (gx * gx + gy * gy) + gz * gz;
-}
+constexpr std::int64_t kPrefetchAhead = 192;  // reals ahead of the scan to fetch early
 
 // Point mode for the first 4 * (m / 4) points; returns the number of points done. The box
 // (lo, hi per axis) is used when kBox. Expects best.index == 0 on entry.
@@ -177,57 +199,79 @@ template <bool kBox>
                                                           std::int64_t m, const double* lo,
                                                           const double* hi, Best& best) {
   const V4 x0 = splat(x[0]), x1 = splat(x[1]), x2 = splat(x[2]);
-  V4 bd = splat(best.d);
-  M4 bi = {0, 0, 0, 0};
+  // Two sets of lanes, for alternate groups of four, so that consecutive groups do not wait
+  // on each other; each lane keeps its strictly smaller distance, so its earliest point on
+  // ties.
+  V4 bd[2] = {splat(best.d), splat(best.d)};
+  M4 bi[2] = {{0, 0, 0, 0}, {0, 0, 0, 0}};
   M4 num = {1, 2, 3, 4};
   const M4 step = {4, 4, 4, 4};
-  std::int64_t j = 0;
-  for (; j + 4 <= m; j += 4) {
-    const double* p = pts + 3 * j;
-    const V4 px = gather3(p, 0), py = gather3(p, 1), pz = gather3(p, 2);
-    const V4 dx = px - x0, dy = py - x1, dz = pz - x2;
+  auto group = [&](std::int64_t j, int set) {
+    const Points4 p = load4(pts + 3 * j);
+    const V4 dx = p.x - x0, dy = p.y - x1, dz = p.z - x2;
     const V4 d = (dx * dx + dy * dy) + dz * dz;
-    M4 take = d < bd;  // strict, per lane: a lane keeps its earliest point on ties
+    M4 take = d < bd[set];
     if constexpr (kBox) {
-      take &= ~((px > hi[0]) | (px < lo[0]) | (py > hi[1]) | (py < lo[1]) | (pz > hi[2]) |
-                (pz < lo[2]));
+      take &= ~((p.x > hi[0]) | (p.x < lo[0]) | (p.y > hi[1]) | (p.y < lo[1]) | (p.z > hi[2]) |
+                (p.z < lo[2]));
     }
-    bd = take ? d : bd;
-    bi = take ? num : bi;
+    bd[set] = take ? d : bd[set];
+    bi[set] = take ? num : bi[set];
     num += step;
+  };
+  std::int64_t j = 0;
+  for (; j + 8 <= m; j += 8) {
+    __builtin_prefetch(pts + 3 * j + kPrefetchAhead);
+    group(j, 0);
+    group(j + 4, 1);
+  }
+  if (j + 4 <= m) {
+    group(j, 0);
+    j += 4;
   }
   // Merge the lanes: smallest distance, then lowest number.
-  for (int l = 0; l < 4; ++l) {
-    if (bi[l] != 0 && (bd[l] < best.d || (bd[l] == best.d && bi[l] < best.index))) {
-      best.d = bd[l];
-      best.index = bi[l];
+  for (int set = 0; set < 2; ++set) {
+    for (int l = 0; l < 4; ++l) {
+      const double d = bd[set][l];
+      const std::int64_t i = bi[set][l];
+      if (i != 0 && (d < best.d || (d == best.d && i < best.index))) {
+        best.d = d;
+        best.index = i;
+      }
     }
   }
   return j;
 }
 
-// Polyline mode for the first 4 * (nseg / 4) segments; returns the number done.
-template <bool kBox>
+// Lane signs of a mask as bits 0..3 (a lane of -1 has its sign bit set).
+inline unsigned mask_bits(const M4& m) {
+  return static_cast<unsigned>(_mm256_movemask_pd(reinterpret_cast<__m256d>(m)));
+}
+
+// Polyline mode, four segments at a time while the points of the next four are there;
+// returns the number of segments done. Segments k .. k+3 run from the points of the group
+// at k to the same points one further on.
 [[gnu::always_inline]] inline std::int64_t segments3_blocks(const double* x, const double* pts,
-                                                            std::int64_t nseg, const double* lo,
-                                                            const double* hi, Best& best) {
+                                                            std::int64_t nseg, Best& best) {
+  if (nseg + 1 < 8) return 0;  // the first group and the next one
+  const V4 x0 = splat(x[0]), x1 = splat(x[1]), x2 = splat(x[2]);
+  Points4 a = load4(pts);
   std::int64_t k = 0;
-  for (; k + 4 <= nseg; k += 4) {
-    const double* a = pts + 3 * k;
-    M4 keep = ~(segment_lower_bound(x, a) > best.d);
-    if constexpr (kBox) {
-      for (int c = 0; c < 3; ++c) {
-        const V4 ac = gather3(a, c), bc = gather3(a + 3, c);
-        keep &= ~(((ac > hi[c]) & (bc > hi[c])) | ((ac < lo[c]) & (bc < lo[c])));
-      }
-    }
-    if (!any(keep)) continue;
+  for (; k + 8 <= nseg + 1; k += 4) {  // points k .. k+7 exist
+    __builtin_prefetch(pts + 3 * k + kPrefetchAhead);
+    const Points4 an = load4(pts + 3 * (k + 4));
+    const V4 gx = axis_gap(a.x - x0, next_lane(a.x, an.x) - x0);
+    const V4 gy = axis_gap(a.y - x1, next_lane(a.y, an.y) - x1);
+    const V4 gz = axis_gap(a.z - x2, next_lane(a.z, an.z) - x2);
+    const unsigned open = ~mask_bits((gx * gx + gy * gy) + gz * gz > best.d) & 0xFu;
+    a = an;
+    if (open == 0) continue;
     for (int l = 0; l < 4; ++l) {
-      if (keep[l] == 0) continue;
-      const double* al = a + 3 * l;
+      if ((open >> l & 1u) == 0) continue;
+      const double* al = pts + 3 * (k + l);
       double u;
       const double d = segment_distance<3>(3, x, al, al + 3, &u);
-      if (d < best.d) {
+      if (d < best.d) {  // strict: ties keep the earlier segment
         best.d = d;
         best.index = k + l + 1;
         best.u = u;
@@ -237,15 +281,76 @@ template <bool kBox>
   return k;
 }
 
+// Bounded polyline mode: the box test on four points at a time, straight from the point
+// array (12 coordinates, three loads, each compared with the faces of its own axis). Bit
+// 3p + i of `above` says that coordinate i of point p is > Xi + h, of `below` that it is
+// < Xi - h. Segment l of a group is skipped when points l and l + 1 share a bit; the others
+// go through the bound of axis_gap, then the per-segment rule, in order. Returns the number
+// of segments done.
+[[gnu::always_inline]] inline std::int64_t boxed_segments3_blocks(const double* x,
+                                                                  const double* pts,
+                                                                  std::int64_t nseg,
+                                                                  const double* lo,
+                                                                  const double* hi, Best& best) {
+  if (nseg + 1 < 8) return 0;  // the first group and the next one
+  const V4 h0 = {hi[0], hi[1], hi[2], hi[0]}, h1 = {hi[1], hi[2], hi[0], hi[1]},
+           h2 = {hi[2], hi[0], hi[1], hi[2]};
+  const V4 l0 = {lo[0], lo[1], lo[2], lo[0]}, l1 = {lo[1], lo[2], lo[0], lo[1]},
+           l2 = {lo[2], lo[0], lo[1], lo[2]};
+  auto faces = [&](const double* p, unsigned* above, unsigned* below) {
+    V4 r0, r1, r2;
+    __builtin_memcpy(&r0, p, sizeof r0);
+    __builtin_memcpy(&r1, p + 4, sizeof r1);
+    __builtin_memcpy(&r2, p + 8, sizeof r2);
+    *above = mask_bits(r0 > h0) | mask_bits(r1 > h1) << 4 |
+             mask_bits(r2 > h2) << 8;
+    *below = mask_bits(r0 < l0) | mask_bits(r1 < l1) << 4 |
+             mask_bits(r2 < l2) << 8;
+  };
+  unsigned above, below;
+  faces(pts, &above, &below);
+  std::int64_t k = 0;
+  for (; k + 8 <= nseg + 1; k += 4) {  // points k .. k+7 exist
+    unsigned above_n, below_n;
+    __builtin_prefetch(pts + 3 * k + kPrefetchAhead);
+    faces(pts + 3 * (k + 4), &above_n, &below_n);
+    const unsigned wa = above | (above_n & 7u) << 12, wb = below | (below_n & 7u) << 12;
+    const unsigned shared = (wa & (wa >> 3)) | (wb & (wb >> 3));
+    // Bit 3l set: segment l shares no face on any axis.
+    unsigned open = ~(shared | (shared >> 1) | (shared >> 2)) & 0x249u;
+    if (open != 0) {
+      const Points4 a = load4(pts + 3 * k), an = load4(pts + 3 * (k + 4));
+      const V4 gx = axis_gap(a.x - x[0], next_lane(a.x, an.x) - x[0]);
+      const V4 gy = axis_gap(a.y - x[1], next_lane(a.y, an.y) - x[1]);
+      const V4 gz = axis_gap(a.z - x[2], next_lane(a.z, an.z) - x[2]);
+      const M4 bound_skips = (gx * gx + gy * gy) + gz * gz > best.d;
+      for (int l = 0; l < 4; ++l) {
+        if ((open >> (3 * l) & 1u) == 0 || bound_skips[l] != 0) continue;
+        const double* al = pts + 3 * (k + l);
+        double u;
+        const double d = segment_distance<3>(3, x, al, al + 3, &u);
+        if (d < best.d) {  // strict: ties keep the earlier segment
+          best.d = d;
+          best.index = k + l + 1;
+          best.u = u;
+        }
+      }
+    }
+    above = above_n;
+    below = below_n;
+  }
+  return k;
+}
+
 // One search in dimension 3: the blocks, then the rest sequentially. The box, when used,
 // has half-width hw around x.
 template <bool kPolylineMode, bool kBox>
-[[gnu::always_inline]] inline void search3(const double* x, const double* pts, std::int64_t m,
-                                           double hw, Best& best) {
+void search3(const double* x, const double* pts, std::int64_t m, double hw, Best& best) {
   const double lo[3] = {x[0] - hw, x[1] - hw, x[2] - hw};
   const double hi[3] = {x[0] + hw, x[1] + hw, x[2] + hw};
   if constexpr (kPolylineMode) {
-    const std::int64_t done = segments3_blocks<kBox>(x, pts, m - 1, lo, hi, best);
+    const std::int64_t done = kBox ? boxed_segments3_blocks(x, pts, m - 1, lo, hi, best)
+                                   : segments3_blocks(x, pts, m - 1, best);
     scan_segments<3, kBox>(3, x, pts, done, m - 1, hw, best);
   } else {
     const std::int64_t done = points3_blocks<kBox>(x, pts, m, lo, hi, best);
@@ -253,26 +358,21 @@ template <bool kPolylineMode, bool kBox>
   }
 }
 
-template <bool kPolylineMode, bool kBox>
-void search3_base(const double* x, const double* pts, std::int64_t m, double hw, Best& best) {
-  search3<kPolylineMode, kBox>(x, pts, m, hw, best);
-}
 
-#if defined(__x86_64__)
-// The same source with 256-bit registers: the same operations, lane by lane.
-template <bool kPolylineMode, bool kBox>
-__attribute__((target("avx2"))) void search3_avx2(const double* x, const double* pts,
-                                                  std::int64_t m, double hw, Best& best) {
-  search3<kPolylineMode, kBox>(x, pts, m, hw, best);
-}
+}  // namespace lanes
+#pragma GCC pop_options
 #endif
 
 template <bool kPolylineMode, bool kBox>
 void search_dim3(const double* x, const double* pts, std::int64_t m, double hw, Best& best) {
 #if defined(__x86_64__)
-  if (__builtin_cpu_supports("avx2")) return search3_avx2<kPolylineMode, kBox>(x, pts, m, hw, best);
+  if (__builtin_cpu_supports("avx2")) return lanes::search3<kPolylineMode, kBox>(x, pts, m, hw, best);
 #endif
-  search3_base<kPolylineMode, kBox>(x, pts, m, hw, best);
+  if constexpr (kPolylineMode) {
+    scan_segments<3, kBox>(3, x, pts, 0, m - 1, hw, best);
+  } else {
+    scan_points<3, kBox>(3, x, pts, 0, m, hw, best);
+  }
 }
 
 // Any dimension: n = 3 goes to the four-lane search, the others scan sequentially.

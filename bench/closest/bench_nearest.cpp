@@ -122,7 +122,7 @@ void set_bytes(benchmark::State& state, std::int64_t m) {
   state.SetBytesProcessed(state.iterations() * m * 3 * static_cast<std::int64_t>(sizeof(double)));
 }
 
-template <bool kWalk, bool kBound>
+template <bool kWalk, bool kBounded>
 void BM_library(benchmark::State& state) {
   const std::int64_t m = state.range(0);
   const Input in = make_input(m, kWalk);
@@ -130,7 +130,7 @@ void BM_library(benchmark::State& state) {
   std::int32_t index = 0, ierr = 0;
   double d2 = 0, t = 0, r2 = kBound, tol = 0.0;
   for (auto _ : state) {
-    if (kBound) {
+    if (kBounded) {
       ynoaod(&n, in.x.data(), &mm, in.pts.data(), &mode, &r2, &tol, &d2, &index, &t, &ierr);
     } else {
       ynoaon(&n, in.x.data(), &mm, in.pts.data(), &mode, &d2, &index, &t, &ierr);
@@ -142,15 +142,15 @@ void BM_library(benchmark::State& state) {
   set_bytes(state, m);
 }
 
-template <bool kWalk, bool kBound>
+template <bool kWalk, bool kBounded>
 void BM_plain_loop(benchmark::State& state) {
   const std::int64_t m = state.range(0);
   const Input in = make_input(m, kWalk);
   std::int32_t index = 0;
   double t = 0;
   for (auto _ : state) {
-    const double d2 = kWalk ? plain_polyline(in.x.data(), in.pts.data(), m, kBound, &index, &t)
-                            : plain_points(in.x.data(), in.pts.data(), m, kBound, &index);
+    const double d2 = kWalk ? plain_polyline(in.x.data(), in.pts.data(), m, kBounded, &index, &t)
+                            : plain_points(in.x.data(), in.pts.data(), m, kBounded, &index);
     benchmark::DoNotOptimize(d2);
     benchmark::DoNotOptimize(index);
     benchmark::DoNotOptimize(t);
