@@ -28,9 +28,9 @@
 
 namespace {
 
-constexpr double kNegligible = 1e-15;      // degenerate squared length, inclusive
-constexpr double kStartBest = 1e60;        // starting best distance of ynoaon
-constexpr std::int32_t kPolyline = 8467;   // mode >= kPolyline selects the polyline
+constexpr double kNegligible = 1e-15;     // degenerate squared length, inclusive
+constexpr double kStartBest = 1e60;       // starting best distance of ynoaon
+constexpr std::int32_t kPolyline = 8467;  // mode >= kPolyline selects the polyline
 
 // Best candidate so far. index 0: none taken; u: parameter of the best segment (per call,
 // starting at 0).
@@ -63,7 +63,8 @@ inline double segment_distance(std::int32_t n_arg, const double* x, const double
       return c * c;
     });
   };
-  const double p = impl::sum_terms(n, [=](std::int32_t i) { return (x[i] - a[i]) * (b[i] - a[i]); });
+  const double p =
+      impl::sum_terms(n, [=](std::int32_t i) { return (x[i] - a[i]) * (b[i] - a[i]); });
   const double len2 = sq([=](std::int32_t i) { return b[i] - a[i]; });
   if (len2 <= kNegligible) {
     *u = 0.5;
@@ -302,10 +303,8 @@ inline unsigned mask_bits(const M4& m) {
     __builtin_memcpy(&r0, p, sizeof r0);
     __builtin_memcpy(&r1, p + 4, sizeof r1);
     __builtin_memcpy(&r2, p + 8, sizeof r2);
-    *above = mask_bits(r0 > h0) | mask_bits(r1 > h1) << 4 |
-             mask_bits(r2 > h2) << 8;
-    *below = mask_bits(r0 < l0) | mask_bits(r1 < l1) << 4 |
-             mask_bits(r2 < l2) << 8;
+    *above = mask_bits(r0 > h0) | mask_bits(r1 > h1) << 4 | mask_bits(r2 > h2) << 8;
+    *below = mask_bits(r0 < l0) | mask_bits(r1 < l1) << 4 | mask_bits(r2 < l2) << 8;
   };
   unsigned above, below;
   faces(pts, &above, &below);
@@ -358,7 +357,6 @@ void search3(const double* x, const double* pts, std::int64_t m, double hw, Best
   }
 }
 
-
 }  // namespace lanes
 #pragma GCC pop_options
 #endif
@@ -366,7 +364,8 @@ void search3(const double* x, const double* pts, std::int64_t m, double hw, Best
 template <bool kPolylineMode, bool kBox>
 void search_dim3(const double* x, const double* pts, std::int64_t m, double hw, Best& best) {
 #if defined(__x86_64__)
-  if (__builtin_cpu_supports("avx2")) return lanes::search3<kPolylineMode, kBox>(x, pts, m, hw, best);
+  if (__builtin_cpu_supports("avx2"))
+    return lanes::search3<kPolylineMode, kBox>(x, pts, m, hw, best);
 #endif
   if constexpr (kPolylineMode) {
     scan_segments<3, kBox>(3, x, pts, 0, m - 1, hw, best);

@@ -53,14 +53,16 @@ bool in_unit(double t) { return t >= 0.0 && t <= 1.0; }  // inclusive; NaN is ou
   };
   Pair ans{0.5, 0.5, impl::kErrNotUnique};
   if (s2 <= kNegligible && !(s1 <= kNegligible)) {
-    ans.t1 = clamp01(sum_n(n, [&](std::int32_t i) {
-                       return ((e.q1[i] + e.q2[i]) / 2.0 - e.p1[i]) * (e.p2[i] - e.p1[i]);
-                     }) /
+    ans.t1 = clamp01(sum_n(n,
+                           [&](std::int32_t i) {
+                             return ((e.q1[i] + e.q2[i]) / 2.0 - e.p1[i]) * (e.p2[i] - e.p1[i]);
+                           }) /
                      s1);
   } else if (s1 <= kNegligible && !(s2 <= kNegligible)) {
-    ans.t2 = clamp01(sum_n(n, [&](std::int32_t i) {
-                       return ((e.p1[i] + e.p2[i]) / 2.0 - e.q1[i]) * (e.q2[i] - e.q1[i]);
-                     }) /
+    ans.t2 = clamp01(sum_n(n,
+                           [&](std::int32_t i) {
+                             return ((e.p1[i] + e.p2[i]) / 2.0 - e.q1[i]) * (e.q2[i] - e.q1[i]);
+                           }) /
                      s2);
   }
   return ans;
@@ -70,8 +72,7 @@ bool in_unit(double t) { return t >= 0.0 && t <= 1.0; }  // inclusive; NaN is ou
 template <int Dim>
 [[gnu::noinline]] Pair parallel_pair(std::int32_t n_arg, const Ends& e, double s1, double s2) {
   const std::int32_t n = Dim > 0 ? Dim : n_arg;
-  auto along = [&](const double* dir0, const double* dir1, const double* from,
-                   const double* to) {
+  auto along = [&](const double* dir0, const double* dir1, const double* from, const double* to) {
     return sum_n(n, [&](std::int32_t i) { return (dir1[i] - dir0[i]) * (to[i] - from[i]); });
   };
   const double tp1 = along(e.q1, e.q2, e.q1, e.p1) / s2;  // d2.(P1 - Q1) / S2
@@ -163,8 +164,8 @@ bool boundary_search(double s1, double s2, double b, double d, double e, Pair* a
 // (10) Squared distance of the chosen pair, sum over i of
 // ((((1 - t1) P1i + t1 P2i) - (1 - t2) Q1i) - t2 Q2i)^2, and the outputs.
 template <int Dim>
-std::int32_t finish(std::int32_t n_arg, const Ends& e, const Pair& ans, double* dist2,
-                    double* t1, double* t2, std::int32_t* ierr) {
+std::int32_t finish(std::int32_t n_arg, const Ends& e, const Pair& ans, double* dist2, double* t1,
+                    double* t2, std::int32_t* ierr) {
   const std::int32_t n = Dim > 0 ? Dim : n_arg;
   const double a1 = 1.0 - ans.t1;
   const double a2 = 1.0 - ans.t2;
@@ -308,10 +309,10 @@ template <int Dim>
     return finish<Dim>(n, ends, degenerate_pair(n, ends, s1, s2), dist2, t1, t2, ierr);
   }
   // (4) X over the pairs; parallel when |X| < (1e-12 S2) S1, strict.
-  const double x =
-      cached ? pair_squares<Dim>(n, a1, a2)
-             : impl::sum_pair_squares(n, [=](std::int32_t i) { return p2[i] - p1[i]; },
-                                      [=](std::int32_t i) { return q2[i] - q1[i]; });
+  const double x = cached ? pair_squares<Dim>(n, a1, a2)
+                          : impl::sum_pair_squares(
+                                n, [=](std::int32_t i) { return p2[i] - p1[i]; },
+                                [=](std::int32_t i) { return q2[i] - q1[i]; });
   if (std::fabs(x) < kParallel * s2 * s1) {
     return finish<Dim>(n, ends, parallel_pair<Dim>(n, ends, s1, s2), dist2, t1, t2, ierr);
   }
@@ -337,11 +338,17 @@ extern "C" std::int32_t ynoall(const std::int32_t* n, const double* seg1, const 
   if (nn == 2) return closest_pair_small<2>(ends, dist2, t1, t2, ierr);
   if (nn == 3) return closest_pair_small<3>(ends, dist2, t1, t2, ierr);
   switch (nn) {
-    case 4: return closest_pair_general<4>(4, ends, dist2, t1, t2, ierr);
-    case 5: return closest_pair_general<5>(5, ends, dist2, t1, t2, ierr);
-    case 6: return closest_pair_general<6>(6, ends, dist2, t1, t2, ierr);
-    case 7: return closest_pair_general<7>(7, ends, dist2, t1, t2, ierr);
-    case 8: return closest_pair_general<8>(8, ends, dist2, t1, t2, ierr);
-    default: return closest_pair_general<0>(nn, ends, dist2, t1, t2, ierr);
+    case 4:
+      return closest_pair_general<4>(4, ends, dist2, t1, t2, ierr);
+    case 5:
+      return closest_pair_general<5>(5, ends, dist2, t1, t2, ierr);
+    case 6:
+      return closest_pair_general<6>(6, ends, dist2, t1, t2, ierr);
+    case 7:
+      return closest_pair_general<7>(7, ends, dist2, t1, t2, ierr);
+    case 8:
+      return closest_pair_general<8>(8, ends, dist2, t1, t2, ierr);
+    default:
+      return closest_pair_general<0>(nn, ends, dist2, t1, t2, ierr);
   }
 }

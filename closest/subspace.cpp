@@ -60,7 +60,8 @@ extern "C" std::int32_t ynjont(const std::int32_t* n, const std::int32_t* m, con
   for (std::int32_t j = 0; j < mm; ++j) {
     const double* p = impl::column(pts, nn, j);
     double* out = coords + static_cast<std::ptrdiff_t>(j) * (kk > 0 ? kk : 0);
-    for (std::int32_t i = 0; i < kk; ++i) out[i] = frame_coordinate(nn, p, y, impl::column(u, nn, i));
+    for (std::int32_t i = 0; i < kk; ++i)
+      out[i] = frame_coordinate(nn, p, y, impl::column(u, nn, i));
   }
   *ierr = 0;
   return impl::kOk;

@@ -51,8 +51,8 @@ std::vector<double> make_pairs(int n, Kind kind) {
 
 // Textbook clamped closest points of two segments, dimension n; called out of line, as
 // a library routine would be.
-[[gnu::noinline]] double textbook(int n, const double* p1, const double* p2, const double* q1, const double* q2,
-                double* s_out, double* t_out) {
+[[gnu::noinline]] double textbook(int n, const double* p1, const double* p2, const double* q1,
+                                  const double* q2, double* s_out, double* t_out) {
   constexpr double kEps = 1e-15;
   double a = 0, e = 0, f = 0, c = 0, b = 0;
   for (int i = 0; i < n; ++i) {

@@ -2,7 +2,6 @@
 // threads at once give, call for call, the answers of a single thread.
 #include <gtest/gtest.h>
 
-#include <array>
 #include <cmath>
 #include <limits>
 #include <thread>
@@ -25,29 +24,24 @@ using Answer = std::vector<std::uint64_t>;
 
 Answer run(const Case& c) {
   Answer out;
-  auto keep = [&out](std::int32_t result, std::int32_t ierr, std::initializer_list<double> v) {
+  std::int32_t n = c.n, m = c.m, k = 2, ierr = -1, index = -7;
+  double d2 = -1, t1 = -1, t2 = -1, coords[2] = {0, 0};
+  auto keep = [&](std::int32_t result, std::initializer_list<double> v) {
     out.push_back(static_cast<std::uint64_t>(result) << 32 | static_cast<std::uint32_t>(ierr));
     for (double d : v) out.push_back(bits(d));
   };
-  std::int32_t n = c.n, m = c.m, ierr = -1, index = -7;
-  double d2 = -1, t1 = -1, t2 = -1;
-  keep(ynoall(&n, c.a.data(), c.b.data(), &d2, &t1, &t2, &ierr), ierr, {d2, t1, t2});
-  keep(ynoal2(&n, c.a.data(), c.b.data(), &d2, &t1, &t2, &ierr), ierr, {d2, t1, t2});
-  keep(ynoapl(&n, c.x.data(), c.a.data(), &d2, &t1, &ierr), ierr, {d2, t1});
-  std::int32_t k = 2;
-  std::array<double, 2> coords{};
-  keep(ynoaot(&n, &k, c.x.data(), c.a.data(), c.b.data(), &d2, coords.data(), &ierr), ierr,
+  keep(ynoall(&n, c.a.data(), c.b.data(), &d2, &t1, &t2, &ierr), {d2, t1, t2});
+  keep(ynoal2(&n, c.a.data(), c.b.data(), &d2, &t1, &t2, &ierr), {d2, t1, t2});
+  keep(ynoapl(&n, c.x.data(), c.a.data(), &d2, &t1, &ierr), {d2, t1});
+  keep(ynoaot(&n, &k, c.x.data(), c.a.data(), c.b.data(), &d2, coords, &ierr),
        {d2, coords[0], coords[1]});
-  std::vector<double> back(c.n);
-  keep(ynraoo(&n, &k, coords.data(), c.a.data(), c.b.data(), back.data(), &ierr), ierr,
-       {back[0], back[c.n - 1]});
   for (std::int32_t mode : {8466, 8467}) {
     index = -7;
-    keep(ynoaon(&n, c.x.data(), &m, c.pts.data(), &mode, &d2, &index, &t1, &ierr), ierr,
+    keep(ynoaon(&n, c.x.data(), &m, c.pts.data(), &mode, &d2, &index, &t1, &ierr),
          {d2, t1, static_cast<double>(index)});
     index = -7;
     keep(ynoaod(&n, c.x.data(), &m, c.pts.data(), &mode, &c.r2, &c.tol, &d2, &index, &t1, &ierr),
-         ierr, {d2, t1, static_cast<double>(index)});
+         {d2, t1, static_cast<double>(index)});
   }
   return out;
 }

@@ -30,8 +30,8 @@ Out bounded(std::int32_t n, const std::vector<double>& x, const std::vector<doub
             std::int32_t mode, double r2, double tol) {
   Out o{-1, -1, -7, -9.0, -9.0};
   std::int32_t m = static_cast<std::int32_t>(pts.size()) / (n > 0 ? n : 1);
-  o.result = ynoaod(&n, x.data(), &m, pts.data(), &mode, &r2, &tol, &o.dist2, &o.index, &o.t,
-                    &o.ierr);
+  o.result =
+      ynoaod(&n, x.data(), &m, pts.data(), &mode, &r2, &tol, &o.dist2, &o.index, &o.t, &o.ierr);
   return o;
 }
 
@@ -45,126 +45,144 @@ void expect_same(const Out& a, const Out& b) {
 
 }  // namespace
 
-TEST(Ynoaon, TooFewPointsOrNoDimensionWritesOnlyTheCode) {
+struct Case {
+  const char* name;
+  std::int32_t n;
+  std::vector<double> x, pts;
+  std::int32_t mode;
+  bool bounded;
+  double r2, tol;
+  Out want;
+};
+class NearestCases : public ::testing::TestWithParam<Case> {};
+
+TEST_P(NearestCases, Answer) {
+  const Case& c = GetParam();
   RecordedFrames frames;
-  const std::vector<double> x = {1, 2, 3}, pts = {1, 2, 3, 4, 5, 6};
-  Out o = nearest(3, x, {1, 2, 3}, kPoints);  // m = 1
-  EXPECT_EQ(o.result, 1);
-  EXPECT_EQ(o.ierr, 4712);
-  EXPECT_EQ(o.index, -7);
-  EXPECT_EQ(o.dist2, -9.0);
-  EXPECT_EQ(o.t, -9.0);
-  std::int32_t n = 0, m = 2, mode = kPolyline, index = -7, ierr = -1;
-  double dist2 = -9.0, t = -9.0, r2 = 1.0, tol = 0.0;
-  EXPECT_EQ(ynoaon(&n, x.data(), &m, pts.data(), &mode, &dist2, &index, &t, &ierr), 1);
-  EXPECT_EQ(ierr, 4712);
-  ierr = -1;
-  EXPECT_EQ(ynoaod(&n, x.data(), &m, pts.data(), &mode, &r2, &tol, &dist2, &index, &t, &ierr), 1);
-  EXPECT_EQ(ierr, 4712);
-  o = bounded(3, x, {1, 2, 3}, kPolyline, 1.0, 0.0);
-  EXPECT_EQ(o.ierr, 4712);
-  EXPECT_EQ(o.index, -7);
-  EXPECT_EQ(dist2, -9.0);
-  EXPECT_EQ(index, -7);
-  EXPECT_EQ(t, -9.0);
+  expect_same(
+      c.bounded ? bounded(c.n, c.x, c.pts, c.mode, c.r2, c.tol) : nearest(c.n, c.x, c.pts, c.mode),
+      c.want);
   EXPECT_TRUE(frames.empty());
 }
 
-TEST(Ynoaon, ModeThresholdAndTiesKeepTheLowerNumber) {
-  // Points 1 to 4 are all 1.25 away (squared 1.5625); the polyline passes nearer.
-  const std::vector<double> x = {0.5, 0.5};
-  const std::vector<double> pts = {-0.75, 0.5, 0.5, 1.75, 1.75, 0.5, 0.5, -0.75, 0.5, -3.0};
-  Out o = nearest(2, x, pts, kPoints);
-  EXPECT_EQ(o.result, 0);
-  EXPECT_EQ(o.index, 1);  // point 1 ties too, and comes first
-  EXPECT_EQ(o.dist2, 1.5625);
-  EXPECT_EQ(bits(o.t), bits(0.0));
-  o = nearest(2, x, pts, kPolyline);
-  // Segment 1 from (-0.75, 0.5) to (0.5, 1.75): p = 1.5625, L = 3.125, u = 1/2, at
-  // (-0.125, 1.125), squared distance 0.78125; segment 2 gives the same and is not taken.
-  EXPECT_EQ(o.index, 1);
-  EXPECT_EQ(o.t, 0.5);
-  EXPECT_EQ(o.dist2, 0.78125);
-  // A huge mode is still the polyline; a negative one the points.
-  EXPECT_EQ(nearest(2, x, pts, 2147483647).t, 0.5);
-  EXPECT_EQ(nearest(2, x, pts, -2147483647 - 1).dist2, 1.5625);
-}
+namespace {
+const double kNaN = std::numeric_limits<double>::quiet_NaN();
+// Points 1 to 4 all 1.25 from (0.5, 0.5); the polyline passes nearer, 0.78125 at u = 1/2 on
+// segments 1, 2 and 3.
+const std::vector<double> kTies = {-0.75, 0.5, 0.5, 1.75, 1.75, 0.5, 0.5, -0.75, 0.5, -3.0};
+// Point 2 lies 0.375 from X along the first axis (squared 0.140625), the others far.
+const std::vector<double> kX3 = {1.5, -0.5, 2.0};
+const std::vector<double> kP3 = {9, 9, 9, 1.875, -0.5, 2.0, 9, 9, 9, 9, 9, 9, 9, 9, 9};
+// Segment 2 from (0.75, -2) to (0.75, 2) passes 0.75 from the origin; segments 1 and 3 lie
+// wholly beyond y = -1 and y = 1.
+const std::vector<double> kBar = {5.0, -2.0, 0.75, -2.0, 0.75, 2.0, -1.0, 2.0};
+}  // namespace
 
-TEST(Ynoaon, PolylineEndsAndDegenerateSegments) {
-  const std::vector<double> x = {3.0, 0.0};
-  // Beyond the last point: the last segment, t = 1, the end point's distance.
-  Out o = nearest(2, x, {-1.0, 0.5, 0.0, 0.0, 2.0, 0.0}, kPolyline);
-  EXPECT_EQ(o.index, 2);
-  EXPECT_EQ(o.t, 1.0);
-  EXPECT_EQ(o.dist2, 1.0);
-  // A repeated point: its midpoint is as near as the end of segment 1, so not taken.
-  o = nearest(2, x, {0.0, 0.0, 2.0, 0.0, 2.0, 0.0}, kPolyline);
-  EXPECT_EQ(o.index, 1);
-  EXPECT_EQ(o.t, 1.0);
-  // A segment of squared length 2^-60 reaching 2^-30 further: its midpoint, 1 - 2^-31 away,
-  // is strictly nearer; (1 - 2^-31)^2 rounds to 1 - 2^-30.
-  o = nearest(2, x, {0.0, 0.0, 2.0, 0.0, 2.0 + 0x1p-30, 0.0}, kPolyline);
-  EXPECT_EQ(o.result, 0);
-  EXPECT_EQ(o.ierr, 0);
-  EXPECT_EQ(o.index, 2);
-  EXPECT_EQ(o.t, 0.5);
-  EXPECT_EQ(bits(o.dist2), bits(1.0 - 0x1p-30));
-}
-
-TEST(Ynoaon, NothingBelowTheStartLeavesIndexAndGivesTZero) {
-  const double nan = std::numeric_limits<double>::quiet_NaN();
-  const std::vector<double> x = {0.0, nan};
-  for (std::int32_t mode : {kPoints, kPolyline}) {
-    const Out o = nearest(2, x, {1, 2, 3, 4, 5, 6}, mode);
-    EXPECT_EQ(o.result, 0);
-    EXPECT_EQ(o.dist2, 1e60);
-    EXPECT_EQ(o.index, -7);
-    EXPECT_EQ(bits(o.t), bits(0.0));
-  }
-}
-
-TEST(Ynoaod, PointBoxHalfWidthIsTheSquaredBoundExceptInSpace) {
-  // r2 = 0.25: the point 0.375 away along the first axis (squared 0.140625) is within the
-  // bound, but outside the box of half-width 0.25 used for n = 2; n = 3 uses sqrt(0.25) + tol.
-  Out o = bounded(2, {1.5, -0.5}, {1.875, -0.5, 9.0, 9.0}, kPoints, 0.25, 0.0);
-  EXPECT_EQ(o.result, 0);
-  EXPECT_EQ(o.ierr, 0);
-  EXPECT_EQ(o.dist2, 0.25);
-  EXPECT_EQ(o.index, -7);  // untouched: nothing found in point mode
-  EXPECT_EQ(bits(o.t), bits(0.0));
-  const std::vector<double> x3 = {1.5, -0.5, 2.0};
-  const std::vector<double> p3 = {9, 9, 9, 1.875, -0.5, 2.0, 9, 9, 9, 9, 9, 9, 9, 9, 9};
-  o = bounded(3, x3, p3, kPoints, 0.25, 0.0);
-  EXPECT_EQ(o.index, 2);
-  EXPECT_EQ(o.dist2, 0.140625);
-  // The margin narrows the box in space: with h = 0.375 the point lies on the face and is
-  // kept (the box is inclusive), with h = 0.25 it is outside.
-  EXPECT_EQ(bounded(3, x3, p3, kPoints, 0.25, -0.125).index, 2);
-  EXPECT_EQ(bounded(3, x3, p3, kPoints, 0.25, -0.25).index, -7);
-  // A point exactly at the bound is not taken (strict).
-  o = bounded(3, x3, p3, kPoints, 0.140625, 0.0);
-  EXPECT_EQ(o.index, -7);
-  EXPECT_EQ(o.dist2, 0.140625);
-}
-
-TEST(Ynoaod, PolylineBoxAndNothingFoundGiveIndexZero) {
-  // Segment 2 runs from (0.75, -2) to (0.75, 2), squared distance 0.5625 from X = 0; with
-  // r2 = 1 the box of half-width 1 admits it, a margin of -0.5 puts both ends beyond the face
-  // x = 0.5. Segments 1 and 3 lie wholly beyond y = -1 and y = 1.
-  const std::vector<double> x = {0.0, 0.0};
-  const std::vector<double> pts = {5.0, -2.0, 0.75, -2.0, 0.75, 2.0, -1.0, 2.0};
-  Out o = bounded(2, x, pts, kPolyline, 1.0, 0.0);
-  EXPECT_EQ(o.index, 2);
-  EXPECT_EQ(o.t, 0.5);
-  EXPECT_EQ(o.dist2, 0.5625);
-  o = bounded(2, x, pts, kPolyline, 1.0, -0.5);
-  EXPECT_EQ(o.result, 0);
-  EXPECT_EQ(o.index, 0);
-  EXPECT_EQ(o.dist2, 1.0);
-  EXPECT_EQ(bits(o.t), bits(0.0));
-  // The same bound met exactly by segment 2 is not taken either.
-  EXPECT_EQ(bounded(2, x, pts, kPolyline, 0.5625, 0.0).index, 0);
-}
+INSTANTIATE_TEST_SUITE_P(
+    Table, NearestCases,
+    ::testing::Values(
+        // Argument checks: only the code is written.
+        Case{"OnePoint", 3, {1, 2, 3}, {1, 2, 3}, kPoints, false, 0, 0, {1, 4712, -7, -9.0, -9.0}},
+        Case{"NoDimension", 0, {1}, {1, 2}, kPolyline, false, 0, 0, {1, 4712, -7, -9.0, -9.0}},
+        Case{"BoundedOnePoint",
+             3,
+             {1, 2, 3},
+             {1, 2, 3},
+             kPolyline,
+             true,
+             1,
+             0,
+             {1, 4712, -7, -9.0, -9.0}},
+        Case{"BoundedNoDimension", 0, {1}, {1, 2}, kPoints, true, 1, 0, {1, 4712, -7, -9.0, -9.0}},
+        // Ties keep the lower number; 8466 is point mode, 8467 and above the polyline, any
+        // negative mode the points.
+        Case{"PointTies", 2, {0.5, 0.5}, kTies, kPoints, false, 0, 0, {0, 0, 1, 1.5625, 0.0}},
+        Case{"PolylineTies", 2, {0.5, 0.5}, kTies, kPolyline, false, 0, 0, {0, 0, 1, 0.78125, 0.5}},
+        Case{"HugeMode", 2, {0.5, 0.5}, kTies, 2147483647, false, 0, 0, {0, 0, 1, 0.78125, 0.5}},
+        Case{
+            "NegativeMode", 2, {0.5, 0.5}, kTies, -2147483647, false, 0, 0, {0, 0, 1, 1.5625, 0.0}},
+        // Beyond the last point: the last segment, t = 1.
+        Case{"BeyondTheEnd",
+             2,
+             {3, 0},
+             {-1, 0.5, 0, 0, 2, 0},
+             kPolyline,
+             false,
+             0,
+             0,
+             {0, 0, 2, 1.0, 1.0}},
+        // A repeated point: its midpoint is only as near as the end of segment 1, not taken.
+        // Reaching 2^-30 further (squared length 2^-60) it is strictly nearer, 1 - 2^-31
+        // away; (1 - 2^-31)^2 rounds to 1 - 2^-30.
+        Case{"RepeatedPoint",
+             2,
+             {3, 0},
+             {0, 0, 2, 0, 2, 0},
+             kPolyline,
+             false,
+             0,
+             0,
+             {0, 0, 1, 1.0, 1.0}},
+        Case{"TinySegment",
+             2,
+             {3, 0},
+             {0, 0, 2, 0, 2 + 0x1p-30, 0},
+             kPolyline,
+             false,
+             0,
+             0,
+             {0, 0, 2, 1 - 0x1p-30, 0.5}},
+        // Nothing below 1e60 (a NaN in X): index untouched, t = 0.
+        Case{"NothingFoundPoints",
+             2,
+             {0, kNaN},
+             {1, 2, 3, 4},
+             kPoints,
+             false,
+             0,
+             0,
+             {0, 0, -7, 1e60, 0.0}},
+        Case{"NothingFoundPolyline",
+             2,
+             {0, kNaN},
+             {1, 2, 3, 4},
+             kPolyline,
+             false,
+             0,
+             0,
+             {0, 0, -7, 1e60, 0.0}},
+        // Bounded point mode, r2 = 0.25: for n = 2 the half-width is r2 itself, so the point
+        // 0.375 away along an axis is skipped though within the bound (index untouched); for
+        // n = 3 it is sqrt(r2) + tol: kept with tol = 0, kept on the face with tol = -0.125
+        // (the box is inclusive), skipped with tol = -0.25. At exactly r2 it is not taken.
+        Case{"HalfWidthR2",
+             2,
+             {1.5, -0.5},
+             {1.875, -0.5, 9, 9},
+             kPoints,
+             true,
+             0.25,
+             0,
+             {0, 0, -7, 0.25, 0.0}},
+        Case{"HalfWidthSqrt", 3, kX3, kP3, kPoints, true, 0.25, 0, {0, 0, 2, 0.140625, 0.0}},
+        Case{"OnTheFace", 3, kX3, kP3, kPoints, true, 0.25, -0.125, {0, 0, 2, 0.140625, 0.0}},
+        Case{"OutsideTheFace", 3, kX3, kP3, kPoints, true, 0.25, -0.25, {0, 0, -7, 0.25, 0.0}},
+        Case{"AtTheBound", 3, kX3, kP3, kPoints, true, 0.140625, 0, {0, 0, -7, 0.140625, 0.0}},
+        // Bounded polyline mode: segment 2 is found with r2 = 1; a margin of -0.5 puts both
+        // its ends beyond the face x = 0.5 and nothing is found (index 0, dist2 = r2); at
+        // exactly its distance it is not taken either.
+        Case{"BoxAdmits", 2, {0, 0}, kBar, kPolyline, true, 1, 0, {0, 0, 2, 0.5625, 0.5}},
+        Case{"BoxSkips", 2, {0, 0}, kBar, kPolyline, true, 1, -0.5, {0, 0, 0, 1.0, 0.0}},
+        Case{"AtTheBoundPolyline",
+             2,
+             {0, 0},
+             kBar,
+             kPolyline,
+             true,
+             0.5625,
+             0,
+             {0, 0, 0, 0.5625, 0.0}}),
+    [](const auto& info) { return std::string(info.param.name); });
 
 namespace {
 
@@ -266,8 +284,8 @@ TEST(NearestSearch, FourLaneSearchMatchesTheSequentialRulesToTheBit) {
     const double r2 = (kind == 2 ? 1e-4 : 0.5) * unit(rng);
     const double tol = 0.1 * (unit(rng) - 0.5);
     for (std::int32_t mode : {kPoints, kPolyline}) {
-      SCOPED_TRACE(::testing::Message() << "trial " << trial << " n " << n << " m " << m
-                                        << " kind " << kind << " mode " << mode);
+      SCOPED_TRACE(::testing::Message() << "trial " << trial << " n " << n << " m " << m << " kind "
+                                        << kind << " mode " << mode);
       expect_same(nearest(n, x, pts, mode), reference(n, x, pts, mode, false, 0, 0));
       expect_same(bounded(n, x, pts, mode, r2, tol), reference(n, x, pts, mode, true, r2, tol));
     }
