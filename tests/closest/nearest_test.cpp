@@ -78,20 +78,14 @@ const std::vector<double> kP3 = {9, 9, 9, 1.875, -0.5, 2.0, 9, 9, 9, 9, 9, 9, 9,
 const std::vector<double> kBar = {5.0, -2.0, 0.75, -2.0, 0.75, 2.0, -1.0, 2.0};
 }  // namespace
 
+// clang-format off
 INSTANTIATE_TEST_SUITE_P(
     Table, NearestCases,
     ::testing::Values(
         // Argument checks: only the code is written.
         Case{"OnePoint", 3, {1, 2, 3}, {1, 2, 3}, kPoints, false, 0, 0, {1, 4712, -7, -9.0, -9.0}},
         Case{"NoDimension", 0, {1}, {1, 2}, kPolyline, false, 0, 0, {1, 4712, -7, -9.0, -9.0}},
-        Case{"BoundedOnePoint",
-             3,
-             {1, 2, 3},
-             {1, 2, 3},
-             kPolyline,
-             true,
-             1,
-             0,
+        Case{"BoundedOnePoint", 3, {1, 2, 3}, {1, 2, 3}, kPolyline, true, 1, 0,
              {1, 4712, -7, -9.0, -9.0}},
         Case{"BoundedNoDimension", 0, {1}, {1, 2}, kPoints, true, 1, 0, {1, 4712, -7, -9.0, -9.0}},
         // Ties keep the lower number; 8466 is point mode, 8467 and above the polyline, any
@@ -99,70 +93,28 @@ INSTANTIATE_TEST_SUITE_P(
         Case{"PointTies", 2, {0.5, 0.5}, kTies, kPoints, false, 0, 0, {0, 0, 1, 1.5625, 0.0}},
         Case{"PolylineTies", 2, {0.5, 0.5}, kTies, kPolyline, false, 0, 0, {0, 0, 1, 0.78125, 0.5}},
         Case{"HugeMode", 2, {0.5, 0.5}, kTies, 2147483647, false, 0, 0, {0, 0, 1, 0.78125, 0.5}},
-        Case{
-            "NegativeMode", 2, {0.5, 0.5}, kTies, -2147483647, false, 0, 0, {0, 0, 1, 1.5625, 0.0}},
+        Case{"NegativeMode", 2, {0.5, 0.5}, kTies, -2147483647, false, 0, 0,
+             {0, 0, 1, 1.5625, 0.0}},
         // Beyond the last point: the last segment, t = 1.
-        Case{"BeyondTheEnd",
-             2,
-             {3, 0},
-             {-1, 0.5, 0, 0, 2, 0},
-             kPolyline,
-             false,
-             0,
-             0,
+        Case{"BeyondTheEnd", 2, {3, 0}, {-1, 0.5, 0, 0, 2, 0}, kPolyline, false, 0, 0,
              {0, 0, 2, 1.0, 1.0}},
         // A repeated point: its midpoint is only as near as the end of segment 1, not taken.
         // Reaching 2^-30 further (squared length 2^-60) it is strictly nearer, 1 - 2^-31
         // away; (1 - 2^-31)^2 rounds to 1 - 2^-30.
-        Case{"RepeatedPoint",
-             2,
-             {3, 0},
-             {0, 0, 2, 0, 2, 0},
-             kPolyline,
-             false,
-             0,
-             0,
+        Case{"RepeatedPoint", 2, {3, 0}, {0, 0, 2, 0, 2, 0}, kPolyline, false, 0, 0,
              {0, 0, 1, 1.0, 1.0}},
-        Case{"TinySegment",
-             2,
-             {3, 0},
-             {0, 0, 2, 0, 2 + 0x1p-30, 0},
-             kPolyline,
-             false,
-             0,
-             0,
+        Case{"TinySegment", 2, {3, 0}, {0, 0, 2, 0, 2 + 0x1p-30, 0}, kPolyline, false, 0, 0,
              {0, 0, 2, 1 - 0x1p-30, 0.5}},
         // Nothing below 1e60 (a NaN in X): index untouched, t = 0.
-        Case{"NothingFoundPoints",
-             2,
-             {0, kNaN},
-             {1, 2, 3, 4},
-             kPoints,
-             false,
-             0,
-             0,
+        Case{"NothingFoundPoints", 2, {0, kNaN}, {1, 2, 3, 4}, kPoints, false, 0, 0,
              {0, 0, -7, 1e60, 0.0}},
-        Case{"NothingFoundPolyline",
-             2,
-             {0, kNaN},
-             {1, 2, 3, 4},
-             kPolyline,
-             false,
-             0,
-             0,
+        Case{"NothingFoundPolyline", 2, {0, kNaN}, {1, 2, 3, 4}, kPolyline, false, 0, 0,
              {0, 0, -7, 1e60, 0.0}},
         // Bounded point mode, r2 = 0.25: for n = 2 the half-width is r2 itself, so the point
         // 0.375 away along an axis is skipped though within the bound (index untouched); for
         // n = 3 it is sqrt(r2) + tol: kept with tol = 0, kept on the face with tol = -0.125
         // (the box is inclusive), skipped with tol = -0.25. At exactly r2 it is not taken.
-        Case{"HalfWidthR2",
-             2,
-             {1.5, -0.5},
-             {1.875, -0.5, 9, 9},
-             kPoints,
-             true,
-             0.25,
-             0,
+        Case{"HalfWidthR2", 2, {1.5, -0.5}, {1.875, -0.5, 9, 9}, kPoints, true, 0.25, 0,
              {0, 0, -7, 0.25, 0.0}},
         Case{"HalfWidthSqrt", 3, kX3, kP3, kPoints, true, 0.25, 0, {0, 0, 2, 0.140625, 0.0}},
         Case{"OnTheFace", 3, kX3, kP3, kPoints, true, 0.25, -0.125, {0, 0, 2, 0.140625, 0.0}},
@@ -173,16 +125,10 @@ INSTANTIATE_TEST_SUITE_P(
         // exactly its distance it is not taken either.
         Case{"BoxAdmits", 2, {0, 0}, kBar, kPolyline, true, 1, 0, {0, 0, 2, 0.5625, 0.5}},
         Case{"BoxSkips", 2, {0, 0}, kBar, kPolyline, true, 1, -0.5, {0, 0, 0, 1.0, 0.0}},
-        Case{"AtTheBoundPolyline",
-             2,
-             {0, 0},
-             kBar,
-             kPolyline,
-             true,
-             0.5625,
-             0,
+        Case{"AtTheBoundPolyline", 2, {0, 0}, kBar, kPolyline, true, 0.5625, 0,
              {0, 0, 0, 0.5625, 0.0}}),
     [](const auto& info) { return std::string(info.param.name); });
+// clang-format on
 
 namespace {
 

@@ -29,6 +29,7 @@ TEST_P(YnoaplCases, Answer) {
   EXPECT_TRUE(frames.empty());
 }
 
+// clang-format off
 INSTANTIATE_TEST_SUITE_P(
     Table, YnoaplCases,
     ::testing::Values(
@@ -45,6 +46,7 @@ INSTANTIATE_TEST_SUITE_P(
         // S1 = S2: p = 0 is not behind, so the length test gives the midpoint with 4717.
         Case{"Degenerate", 2, {1.5, -2.0}, {-0.5, 1.0, -0.5, 1.0}, 1, 4717, 0.5, 13.0},
         // Squared length 2^-100 but X behind S1 (p < 0): answered from S1 with code 0.
-        Case{
-            "DegenerateBehind", 2, {1.5, -2.0}, {-0.5, 1.0, -0.5 - 0x1p-50, 1.0}, 0, 0, 0.0, 13.0}),
+        Case{"DegenerateBehind", 2, {1.5, -2.0}, {-0.5, 1.0, -0.5 - 0x1p-50, 1.0}, 0, 0, 0.0,
+             13.0}),
     [](const auto& info) { return std::string(info.param.name); });
+// clang-format on

@@ -31,6 +31,7 @@ TEST_P(Ynoal2Cases, Answer) {
   EXPECT_TRUE(frames.empty());
 }
 
+// clang-format off
 INSTANTIATE_TEST_SUITE_P(
     Table, Ynoal2Cases,
     ::testing::Values(
@@ -46,13 +47,7 @@ INSTANTIATE_TEST_SUITE_P(
         Case{"Degenerate", 3, {1.5, 3, 0.75, 1.5, 3, 0.75}, kLine, 1, 4717, 0.5, 3.5, 4.5625},
         // U = (2, 0, 0) is used as given: b = 0, e = 8, f = -5, X = 64 give t = 1/8 and
         // s = 5/4; P(1/8) = (0.5, -0.5, 0.75) lies 1.5 from O + s U = (0.5, 1, 0) in y.
-        Case{"DirectionNotNormalised",
-             3,
-             {0.5, -1, 0.75, 0.5, 3, 0.75},
-             {2, 0, 0, -2, 1, 0},
-             0,
-             0,
-             0.125,
-             1.25,
-             2.8125}),
+        Case{"DirectionNotNormalised", 3, {0.5, -1, 0.75, 0.5, 3, 0.75}, {2, 0, 0, -2, 1, 0}, 0, 0,
+             0.125, 1.25, 2.8125}),
     [](const auto& info) { return std::string(info.param.name); });
+// clang-format on
