@@ -237,13 +237,16 @@ std::int32_t wncgnn(void* ctx, const std::int32_t* n, Orvq7PathFct fct, const do
     }
     kept.norm = norm;
     copy(nn, x, kept.x);
-    // (4) (J V) dz = F: (J V)(k, l) = sum over i ascending of J(k, i) V(i, l).
+    // (4) (J V) dz = F: (J V)(k, l) = sum over i ascending of J(k, i) V(i, l), from 0. The
+    // rows k are accumulated side by side, each in that order.
     double jv[kMaxN * kMaxN];
     for (std::int32_t l = 0; l < m; ++l) {
-      for (std::int32_t k = 0; k < m; ++k) {
-        double s = 0.0;
-        for (std::int32_t i = 0; i < nn; ++i) s += jac[k + m * i] * v[i + nn * l];
-        jv[k + m * l] = s;
+      double* col = jv + m * l;
+      for (std::int32_t k = 0; k < m; ++k) col[k] = 0.0;
+      for (std::int32_t i = 0; i < nn; ++i) {
+        const double vil = v[i + nn * l];
+        const double* ji = jac + m * i;
+        for (std::int32_t k = 0; k < m; ++k) col[k] += ji[k] * vil;
       }
     }
     double dz[kMaxN];
@@ -252,13 +255,17 @@ std::int32_t wncgnn(void* ctx, const std::int32_t* n, Orvq7PathFct fct, const do
       kept.hand_out(nn, xnew, rnorm);
       return impl::fail(ierr, impl::kErrInnerSolve);
     }
-    // z := z - dz; x := p + V z, (V z)_i summed over l ascending.
+    // z := z - dz; x := p + V z, (V z)_i summed over l ascending from 0 (the unknowns side
+    // by side).
     for (std::int32_t l = 0; l < m; ++l) z[l] = z[l] - dz[l];
-    for (std::int32_t i = 0; i < nn; ++i) {
-      double s = 0.0;
-      for (std::int32_t l = 0; l < m; ++l) s += v[i + nn * l] * z[l];
-      x[i] = p[i] + s;
+    double vz[kMaxN];
+    for (std::int32_t i = 0; i < nn; ++i) vz[i] = 0.0;
+    for (std::int32_t l = 0; l < m; ++l) {
+      const double zl = z[l];
+      const double* vl = v + nn * l;
+      for (std::int32_t i = 0; i < nn; ++i) vz[i] += vl[i] * zl;
     }
+    for (std::int32_t i = 0; i < nn; ++i) x[i] = p[i] + vz[i];
   }
 }
 
