@@ -6,7 +6,6 @@
 // the latter measured by replaying the same mix of requests on their own), bytes_per_point
 // (table storage held by the result, capacity included).
 #include <benchmark/benchmark.h>
-
 #include <time.h>
 
 #include <cmath>
@@ -76,8 +75,8 @@ std::int32_t evaluate(void* ctx, const std::int32_t*, const double* x, const std
   }
   if (r & 4) {
     for (std::int32_t i = 0; i < m * n * n; ++i) hes[i] = 0.0;
-    hes[0] = 2.0;                // d2F1/dx1dx1
-    hes[m * (1 + n)] = 2.0;      // d2F1/dx2dx2
+    hes[0] = 2.0;            // d2F1/dx1dx1
+    hes[m * (1 + n)] = 2.0;  // d2F1/dx2dx2
     if (s.shape == Shape::kViviani) {
       hes[m * (2 + 2 * n)] = 2.0;
       hes[1] = 2.0;
@@ -95,8 +94,8 @@ struct Path {
 };
 
 Path make_path(Shape shape, std::int32_t n, double tol, std::int32_t mode) {
-  Path p{System{shape, n}, std::vector<double>(2 * n, 0.0), {}, {}, std::vector<double>(n, tol),
-         mode};
+  Path p{
+      System{shape, n}, std::vector<double>(2 * n, 0.0), {}, {}, std::vector<double>(n, tol), mode};
   p.box.assign(n, -3.0);
   p.box.insert(p.box.end(), n, 3.0);
   p.pas.assign(n, 1e-9);
@@ -194,8 +193,8 @@ void run(benchmark::State& state, Path p) {
     calls += counted.calls[r];
     if (counted.calls[r] > 0) eval_seconds += counted.calls[r] * seconds_per_call(p, r);
   }
-  state.counters["points"] = benchmark::Counter(static_cast<double>(points),
-                                                benchmark::Counter::kIsRate);
+  state.counters["points"] =
+      benchmark::Counter(static_cast<double>(points), benchmark::Counter::kIsRate);
   state.counters["points_per_path"] = static_cast<double>(points) / state.iterations();
   state.counters["evals_per_point"] = static_cast<double>(calls) / points;
   state.counters["outside_us_per_point"] = 1e6 * (seconds - eval_seconds) / points;
