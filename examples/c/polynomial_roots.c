@@ -30,8 +30,7 @@ static void check_roots(const char* what, const double* roots, const double* wan
   const double tol = 1e-12;
   int used[4] = {0, 0, 0, 0};
   printf("%s:\n", what);
-  for (int k = 0; k < count; ++k)
-    printf("  (%.17g, %.17g)\n", roots[2 * k], roots[2 * k + 1]);
+  for (int k = 0; k < count; ++k) printf("  (%.17g, %.17g)\n", roots[2 * k], roots[2 * k + 1]);
   for (int e = 0; e < count; ++e) {
     int found = 0;
     for (int k = 0; k < count && !found; ++k) {

@@ -1,6 +1,6 @@
-/* traced_path.c -- a curve traced by ynchem with the evaluation routine written in C: the
- * unit circle x^2 + y^2 = 1, from (1, 0) counter-clockwise until it closes on its start.
- * The points are read back from the result tables with yncrea and yutrea, and the result is
+/* traced_path.c -- the unit circle x^2 + y^2 = 1 traced by ynchem, with the evaluation
+ * routine written in C, from (1, 0) counter-clockwise until the path closes on its start. The
+ * points are read back from the result tables with yncrea and yutrea, and the result is
  * released with yncend. */
 #include <math.h>
 #include <stdio.h>
@@ -63,13 +63,13 @@ static void* read_kind(int32_t itab, int32_t kind, size_t entry_bytes, int32_t* 
 int main(void) {
   const int32_t n = 2;
   struct Circle circ = {1.0, 0};
-  const double eps = 1e-20;                /* on the curve: residual^2 <= eps */
-  const double xd[4] = {1.0, 0.0,          /* start point x0 = (1, 0) */
-                        0.0, 1.0};         /* start direction d0 = (0, 1) */
+  const double eps = 1e-20;        /* on the curve: residual^2 <= eps */
+  const double xd[4] = {1.0, 0.0,  /* start point x0 = (1, 0) */
+                        0.0, 1.0}; /* start direction d0 = (0, 1) */
   const double box[4] = {-2.0, -2.0, 2.0, 2.0};
   const double pas[4] = {1e-6, 1e-6, 0.5, 0.5};
-  const int32_t mode = 4;   /* steps from the curvature */
-  const double tol = 1e-2;  /* steps of at most 0.9 / sqrt(0.5 / tol + 1 / 0.5^2) = 0.1225 */
+  const int32_t mode = 4;      /* steps from the curvature */
+  const double tol = 1e-2;     /* steps of at most 0.9 / sqrt(0.5 / tol + 1 / 0.5^2) = 0.1225 */
   const int32_t store = 2 + 8; /* kind 23 (x, t), and kinds 1, 2, 3 (phase, number, x) */
   int32_t itab = 0, ierr = -1;
 
@@ -104,14 +104,14 @@ int main(void) {
     for (int32_t j = 0; j < count; ++j) {
       const double* p = xt + 4 * j;
       const double r2 = p[0] * p[0] + p[1] * p[1];
-      if (fabs(r2 - 1.0) > 1e-9) on_circle = 0;  /* (r2 - 1)^2 <= eps = 1e-20 */
+      if (fabs(r2 - 1.0) > 1e-9) on_circle = 0; /* (r2 - 1)^2 <= eps = 1e-20 */
       /* The unit tangent of travel at (cos a, sin a) is (-sin a, cos a). */
       if (fabs(p[2] + p[1]) > 1e-8 || fabs(p[3] - p[0]) > 1e-8) unit_tangent = 0;
       if (p[0] * p[3] - p[1] * p[2] <= 0.0) counter_clockwise = 0;
       if (number[j] != j + 1) numbered = 0;
       if (j > 0 && j < count - 1 && phase[j] != 1) along = 0;
       if (j > 0) {
-        const double* q = p - 4;  /* the angle from the previous point, in (-pi, pi] */
+        const double* q = p - 4; /* the angle from the previous point, in (-pi, pi] */
         const double step = atan2(q[0] * p[1] - q[1] * p[0], q[0] * p[0] + q[1] * p[1]);
         if (step <= 0.0) counter_clockwise = 0;
         turned += step;

@@ -26,8 +26,8 @@ Closest closest(const Segment& s1, const Segment& s2) {
   const std::int32_t n = 3;
   Closest c{};
   c.result = ynoall(&n, s1.data(), s2.data(), &c.dist2, &c.t1, &c.t2, &c.code);
-  std::printf("ynoall: result %d, code %d, t1 %.17g, t2 %.17g, dist2 %.17g\n", c.result,
-              c.code, c.t1, c.t2, c.dist2);
+  std::printf("ynoall: result %d, code %d, t1 %.17g, t2 %.17g, dist2 %.17g\n", c.result, c.code,
+              c.t1, c.t2, c.dist2);
   return c;
 }
 

@@ -30,8 +30,8 @@ Roots as_complex(const double* pairs, std::int32_t count) {
 bool same_roots(Roots got, const Roots& want, double tol = 1e-12) {
   if (got.size() != want.size()) return false;
   for (const auto& w : want) {
-    const auto hit = std::find_if(got.begin(), got.end(),
-                                  [&](const auto& z) { return std::abs(z - w) <= tol; });
+    const auto hit =
+        std::find_if(got.begin(), got.end(), [&](const auto& z) { return std::abs(z - w) <= tol; });
     if (hit == got.end()) return false;
     got.erase(hit);
   }

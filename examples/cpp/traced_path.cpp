@@ -42,8 +42,8 @@ struct UnitCircle {
 
 // The routine ynchem calls: hands the request to the object behind ctx.
 template <class Curve>
-std::int32_t evaluate(void* ctx, const std::int32_t* npts, const double* x,
-                      const std::int32_t* req, double* out, std::int32_t* ierr) {
+std::int32_t evaluate(void* ctx, const std::int32_t* npts, const double* x, const std::int32_t* req,
+                      double* out, std::int32_t* ierr) {
   (*static_cast<Curve*>(ctx))(*npts, x, *req, out);
   *ierr = 0;
   return 0;
@@ -86,8 +86,8 @@ int main() {
     const double box[4] = {-1.5, -1.5, 1.5, 1.5};  // lower bounds, then upper bounds
     const double pas[4] = {1e-6, 1e-6, 0.5, 0.5};  // minimum steps, then maximum steps
     std::int32_t itab = 0, ierr = -1;
-    const std::int32_t result = ynchem(&circle, &n, evaluate<UnitCircle>, &eps, xd, box, pas,
-                                       &mode, &tol, &store, &itab, &ierr);
+    const std::int32_t result = ynchem(&circle, &n, evaluate<UnitCircle>, &eps, xd, box, pas, &mode,
+                                       &tol, &store, &itab, &ierr);
     std::printf("ynchem: result %d, ierr %d, %d evaluations\n", result, ierr, circle.calls);
     expect(result == 0 && ierr == ORVQ7_OK && itab != 0 && circle.calls > 0,
            "ynchem traced the circle, calling the C++ object");

@@ -1,6 +1,7 @@
-! traced_path.f90 -- a curve traced by ynchem with the evaluation routine written in Fortran:
-! the unit circle x^2 + y^2 = 1, from (-1, 0) counter-clockwise until it closes on its start.
-! The points are read back with yncrea and yutrea, and the result released with yncend.
+! traced_path.f90 -- the unit circle x^2 + y^2 = 1 traced by ynchem, with the evaluation
+! routine written in Fortran (a bind(C) function), from (-1, 0) counter-clockwise until the path
+! closes on its start. The points are read back with yncrea and yutrea, and the result is
+! released with yncend.
 
 ! The evaluation routine, a bind(C) procedure whose address (c_funloc) ynchem is given.
 module traced_path_curve
