@@ -12,7 +12,7 @@ namespace {
 constexpr double kWidth = 640.0;
 constexpr double kPlotLeft = 80.0, kPlotRight = 40.0, kPlotBottom = 60.0;
 constexpr double kLine = 18.0;              // height of a line of text
-constexpr double kMaxAspect = 4.0;          // beyond this ratio the axes get separate scales
+constexpr double kMaxRatio = 4.0;          // beyond this ratio the axes get separate scales
 constexpr std::size_t kMaxDots = 600;       // more points than this: the line alone
 constexpr double kArrow = 36.0;             // length of the start-direction arrow, pixels
 
@@ -51,7 +51,7 @@ std::string render_svg(const Picture& p) {
   if (!(rx > 0.0) || !std::isfinite(rx)) rx = 1.0;
   if (!(ry > 0.0) || !std::isfinite(ry)) ry = 1.0;
   double sx = plot_w / (1.08 * rx), sy = plot_h / (1.08 * ry);
-  if (rx / ry <= kMaxAspect && ry / rx <= kMaxAspect) sx = sy = std::min(sx, sy);
+  if (rx / ry <= kMaxRatio && ry / rx <= kMaxRatio) sx = sy = std::min(sx, sy);
   const double cx = kPlotLeft + plot_w / 2.0, cy = top + plot_h / 2.0;
   const double mx = (p.xmin + p.xmax) / 2.0, my = (p.ymin + p.ymax) / 2.0;
   auto X = [&](double x) { return cx + (x - mx) * sx; };
