@@ -191,6 +191,12 @@ std::int32_t evaluate_system(void* ctx, const std::int32_t* npts, const double* 
       }
       if (*req & 4) {
         s.hessian(xp, out);
+        // Second derivatives that are not finite (a stencil reaching past the edge of the
+        // equations' domain) are given as 0: the step is then bounded by the maximum steps,
+        // and a path running into that edge ends there instead of failing on a step length
+        // that is not a number.
+        for (std::size_t e = 0; e < m * n * n; ++e)
+          if (!std::isfinite(out[e])) out[e] = 0.0;
         out += m * n * n;
       }
     }

@@ -85,6 +85,8 @@ struct EvalContext {
 
 // The six-argument evaluation routine of the path solver over an EvalContext: residuals
 // (req bit 1), Jacobian (bit 2), second derivatives (bit 4), per point, in that order.
+// Second derivatives that are not finite are given as 0 (so a path that runs into the edge
+// of the equations' domain, sqrt(1 - x^2) at x = 1, ends there by collapse of the step).
 // Never throws: a failure is result 1 with ierr 4715 and the reason in ctx->failure.
 std::int32_t evaluate_system(void* ctx, const std::int32_t* npts, const double* x,
                              const std::int32_t* req, double* out, std::int32_t* ierr);

@@ -29,8 +29,8 @@ struct TraceArgs {
   std::vector<std::string> equations;
   std::string vars, start, dir, box, step, tol, axes = "1,2", out = "orvq7-out", name = "trace";
   std::int32_t kind = 4;
-  bool order2 = false, no_turn_test = false, json = false, quiet = false;
-  double eps = 1e-10, progress = 1.0;
+  bool order2 = false, no_turn_test = false, json = false, quiet = false, snap = false;
+  double eps = 1e-20, progress = 1.0;
   std::uint64_t max_evals = 2000000;
 };
 
@@ -68,6 +68,7 @@ int run_trace(const TraceArgs& a) {
   plan.order2 = a.order2;
   plan.turn_test = !a.no_turn_test;
   plan.eps = a.eps;
+  plan.snap = a.snap;
   plan.max_evals = a.max_evals;
   plan.progress_after = a.quiet ? -1.0 : a.progress;
   plan.progress_name = a.name;
@@ -164,13 +165,17 @@ int run(int argc, char** argv) {
   trace->add_option("--tol", ta.tol,
                     "path tolerance, 1 or n values (default by kind: 2 width/100, "
                     "4 width/4000, 8 0.1)");
-  trace->add_option("--kind", ta.kind, "path kind: 2 step bound, 4 deviation, 8 turn")
+  trace->add_option("--kind", ta.kind,
+                    "path kind: 2 steps of at most 0.9 tol; 4 chords within about tol/5 of the "
+                    "curve; 8 tangent turning by about 0.9 tol radians per step")
       ->check(CLI::IsMember({2, 4, 8}))
       ->capture_default_str();
-  trace->add_flag("--order2", ta.order2, "order level 2 (kinds 4 and 8)");
+  trace->add_flag("--secant-curvature", ta.order2,
+                  "curvature from the last two tangents, no second derivatives (kinds 4, 8)");
   trace->add_flag("--no-turn-test", ta.no_turn_test, "accept steps that turn by over 22.5 deg");
   trace->add_option("--eps", ta.eps, "residual threshold: sum of squares at most eps")
       ->capture_default_str();
+  trace->add_flag("--snap", ta.snap, "move a start point near the curve onto it first");
   trace->add_option("--axes", ta.axes, "the two unknowns of the picture, by name or number")
       ->capture_default_str();
   trace->add_option("--out", ta.out, "folder to write into")->capture_default_str();

@@ -154,11 +154,13 @@ std::string trace_report(const EquationSystem& system, const TracePlan& plan,
     box += fmt::format("{}{} in [{}, {}]", i == 0 ? "" : ", ", names[i], plan.lower[i],
                        plan.upper[i]);
   s += fmt::format("  box        {}\n", box);
-  s += fmt::format("  start      {}\n", point_text(names, plan.start.data(), n));
+  s += fmt::format("  start      {}{}\n", point_text(names, plan.start.data(), n),
+                   plan.snapped > 0.0 ? fmt::format(", moved {:.3g} onto the curve", plan.snapped)
+                                      : "");
   if (r.direction.size() == n)
     s += fmt::format("  direction  {}\n", point_text(names, r.direction.data(), n));
   s += fmt::format("  path kind  {}, tolerance {}{}\n", plan.kind, fmt::join(plan.tol, ", "),
-                   plan.order2 ? ", order level 2" : "");
+                   plan.order2 ? ", curvature from the tangents" : "");
   s += fmt::format("  ending     {}\n", r.ending_text);
   if (r.ending != Ending::kFailed) {
     s += fmt::format("  points     {}, length {:.10g}\n", r.count(), r.length);

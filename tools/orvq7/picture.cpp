@@ -13,7 +13,7 @@ constexpr double kWidth = 640.0;
 constexpr double kPlotLeft = 80.0, kPlotRight = 40.0, kPlotBottom = 60.0;
 constexpr double kLine = 18.0;              // height of a line of text
 constexpr double kMaxRatio = 4.0;          // beyond this ratio the axes get separate scales
-constexpr std::size_t kMaxDots = 600;       // more points than this: the line alone
+constexpr std::size_t kMaxDots = 400;       // more points than this: the line alone
 constexpr double kArrow = 36.0;             // length of the start-direction arrow, pixels
 
 // Numbers of the picture, short and without a trailing ".0".
@@ -123,7 +123,7 @@ std::string render_svg(const Picture& p) {
     s += "<g fill=\"#1f5fbf\">";
     for (std::size_t i = 0; i < count; ++i)
       if (std::isfinite(p.xs[i]) && std::isfinite(p.ys[i]))
-        s += fmt::format("<circle cx=\"{}\" cy=\"{}\" r=\"2\"/>", px(X(p.xs[i])),
+        s += fmt::format("<circle cx=\"{}\" cy=\"{}\" r=\"1.6\"/>", px(X(p.xs[i])),
                          px(Y(p.ys[i])));
     s += "</g>\n";
   }
@@ -133,7 +133,10 @@ std::string render_svg(const Picture& p) {
     const double x0 = X(p.xs[0]), y0 = Y(p.ys[0]);
     const double dx = p.dir_x * sx, dy = -p.dir_y * sy;
     const double len = std::sqrt(dx * dx + dy * dy);
-    if (len > 0.0 && std::isfinite(len))
+    const bool arrow = len > 0.0 && std::isfinite(len);
+    // The label goes behind the start, away from the arrow: (ux, uy) points to it.
+    const double ux = arrow ? -dx / len : 0.7, uy = arrow ? -dy / len : 0.7;
+    if (arrow)
       s += fmt::format(
           "<line x1=\"{}\" y1=\"{}\" x2=\"{}\" y2=\"{}\" stroke=\"#2e8b3e\" stroke-width=\"2\" "
           "marker-end=\"url(#arrow)\"/>\n",
@@ -142,8 +145,9 @@ std::string render_svg(const Picture& p) {
         "<circle cx=\"{}\" cy=\"{}\" r=\"6\" fill=\"#2e8b3e\" stroke=\"#ffffff\" "
         "stroke-width=\"1.5\"/>\n",
         px(x0), px(y0));
-    s += fmt::format("<text x=\"{}\" y=\"{}\" fill=\"#2e8b3e\">start</text>\n", px(x0 + 9),
-                     px(y0 + 16));
+    s += fmt::format("<text x=\"{}\" y=\"{}\" fill=\"#2e8b3e\" text-anchor=\"{}\">start</text>\n",
+                     px(x0 + 14 * ux), px(y0 + 14 * uy + 4 + 6 * std::fabs(uy)),
+                     ux > 0.3 ? "start" : ux < -0.3 ? "end" : "middle");
   }
   if (count > 0) {
     const double xe = X(p.xs[count - 1]), ye = Y(p.ys[count - 1]);

@@ -12,6 +12,7 @@
 
 #include "companions/system/system_api.h"
 #include "input.h"
+#include "linalg/linalg_api.h"
 #include "path/path_api.h"
 
 namespace orvq7tool {
@@ -31,8 +32,8 @@ constexpr std::int32_t kKindPointTangent = 23, kKindPhase = 1, kKindPoint = 3;
 constexpr std::int32_t kNoTangent = 4710;
 
 // Default path tolerances, relative to the smallest box width w: kind 2 bounds the step
-// (w / 100), kind 4 the deviation of a step from the curve (w / 4000); kind 8 the tangent of
-// the turn per step (0.1, about 5.7 degrees).
+// (0.9 tol: w / 100), kind 4 the distance of a chord from the curve (about tol / 5, with
+// tol = w / 4000); kind 8 the turn of the tangent per step (about 0.9 tol radians, tol 0.1).
 double default_tol(std::int32_t kind, double w) {
   if (kind == 2) return w / 100.0;
   if (kind == 4) return w / 4000.0;
@@ -131,6 +132,36 @@ void read_result(std::int32_t itab, TraceResult& r) {
   std::memcpy(r.phases.data(), ph.data(), std::min(ph.size(), r.phases.size() * 4));
 }
 
+// Gauss-Newton steps of least length towards the curve from x: x -= J' y, (J J') y = F.
+// Stops when the residual sum is at most eps, stops decreasing, or after 50 steps.
+void snap_to_curve(const EquationSystem& system, double eps, std::vector<double>& x) {
+  const std::size_t n = system.unknowns(), m = system.equations();
+  std::vector<double> f(m), jac(m * n), a(m * m), y(m), trial(n);
+  double r = system.residual_sum(x.data());
+  for (int iter = 0; iter < 50 && r > eps; ++iter) {
+    system.residuals(x.data(), f.data());
+    system.jacobian(x.data(), jac.data());
+    for (std::size_t p = 0; p < m; ++p)
+      for (std::size_t q = 0; q < m; ++q) {
+        double s = 0.0;
+        for (std::size_t i = 0; i < n; ++i) s += jac[p + m * i] * jac[q + m * i];
+        a[p + m * q] = s;
+      }
+    const std::int32_t order = static_cast<std::int32_t>(m);
+    std::int32_t ierr = 0;
+    if (ynsega(&order, a.data(), f.data(), y.data(), &ierr) == 1) return;
+    for (std::size_t i = 0; i < n; ++i) {
+      double s = 0.0;
+      for (std::size_t k = 0; k < m; ++k) s += jac[k + m * i] * y[k];
+      trial[i] = x[i] - s;
+    }
+    const double rt = system.residual_sum(trial.data());
+    if (!(rt < r)) return;
+    x = trial;
+    r = rt;
+  }
+}
+
 }  // namespace
 
 std::vector<std::string> default_names(std::size_t n) {
@@ -161,13 +192,13 @@ void check_plan(EquationSystem& system, TracePlan& plan) {
   if (plan.kind != 2 && plan.kind != 4 && plan.kind != 8)
     throw ToolError(fmt::format("path kind {}: expected 2, 4 or 8", plan.kind));
   if (plan.order2 && plan.kind == 2)
-    throw ToolError("order level 2 needs path kind 4 or 8");
+    throw ToolError("the curvature from the tangents needs path kind 4 or 8");
   double wmin = 0.0;
   std::vector<double> scales(n);
   for (std::size_t i = 0; i < n; ++i) {
     const double w = plan.upper[i] - plan.lower[i];
-    if (!(w > 0.0) || !std::isfinite(w))
-      throw ToolError(fmt::format("box: the range of {} is empty", system.names()[i]));
+    if (!std::isfinite(w))
+      throw ToolError(fmt::format("box: the range of {} is too wide", system.names()[i]));
     wmin = i == 0 ? w : std::min(wmin, w);
     scales[i] = std::min(1.0, w);
   }
@@ -201,13 +232,29 @@ void check_plan(EquationSystem& system, TracePlan& plan) {
       throw ToolError(fmt::format("start point: {} = {} lies outside its box range {}:{}",
                                   system.names()[i], plan.start[i], plan.lower[i],
                                   plan.upper[i]));
-  const double r = system.residual_sum(plan.start.data());
+  double moved = 0.0;
+  double r = system.residual_sum(plan.start.data());
+  if (plan.snap && r > plan.eps && std::isfinite(r)) {
+    std::vector<double> x = plan.start;
+    snap_to_curve(system, plan.eps, x);
+    for (std::size_t i = 0; i < n; ++i) moved += (x[i] - plan.start[i]) * (x[i] - plan.start[i]);
+    moved = std::sqrt(moved);
+    for (std::size_t i = 0; i < n; ++i)
+      if (x[i] < plan.lower[i] || x[i] > plan.upper[i])
+        throw ToolError(fmt::format("start point: moved onto the curve, {} = {} lies outside "
+                                    "its box range {}:{}",
+                                    system.names()[i], x[i], plan.lower[i], plan.upper[i]));
+    plan.start = x;
+    r = system.residual_sum(plan.start.data());
+  }
   if (!std::isfinite(r))
     throw ToolError("start point: the equations give no number there (NaN or infinite)");
   if (r > plan.eps)
     throw ToolError(fmt::format("start point is off the curve: sum of squared residuals {:.3g} "
-                                "> eps {:.3g}",
-                                r, plan.eps));
+                                "> eps {:.3g}{}",
+                                r, plan.eps,
+                                plan.snap ? " after snapping" : " (--snap moves it onto it)"));
+  plan.snapped = moved;
 }
 
 TraceResult trace_path(const EquationSystem& system, const TracePlan& plan) {
@@ -241,6 +288,12 @@ TraceResult trace_path(const EquationSystem& system, const TracePlan& plan) {
                                                            : code_text(ierr)));
     r.direction = t;
   }
+  // The driver takes d0 as the first tangent, length included: give it unit length.
+  double len2 = 0.0;
+  for (double d : r.direction) len2 += d * d;
+  const double len = std::sqrt(len2);
+  if (!(len > 0.0) || !std::isfinite(len)) throw ToolError("the start direction is zero");
+  for (double& d : r.direction) d /= len;
   for (std::size_t i = 0; i < r.n; ++i) {
     if ((plan.start[i] == plan.lower[i] && r.direction[i] < 0.0) ||
         (plan.start[i] == plan.upper[i] && r.direction[i] > 0.0))

@@ -18,9 +18,11 @@ struct TracePlan {
   std::vector<double> step_min, step_max;
   std::vector<double> tol;            // one value, or n values (per-unknown tolerance)
   std::int32_t kind = 4;              // path kind 2, 4 or 8
-  bool order2 = false;                // order level 2 (kinds 4 and 8)
+  bool order2 = false;                // curvature from the tangents (kinds 4 and 8)
   bool turn_test = true;              // reject steps whose tangent turns by over 22.5 degrees
-  double eps = 1e-10;                 // residual threshold: sum of squares at most eps
+  double eps = 1e-20;                 // residual threshold: sum of squares at most eps
+  bool snap = false;                  // move a start point near the curve onto it
+  double snapped = 0.0;               // set by check_plan: how far the start point moved
   std::uint64_t max_evals = 2000000;  // evaluation routine calls before giving up; 0: none
   double progress_after = 1.0;        // seconds before a progress line; negative: never
   std::string progress_name;          // shown in the progress line
@@ -32,7 +34,7 @@ struct TraceResult {
   std::int32_t code = 0;           // ynchem's ierr
   std::int32_t result = 0;         // ynchem's result, 0 or 1
   std::size_t n = 0;               // unknowns
-  std::vector<double> direction;   // d0 as used
+  std::vector<double> direction;   // d0 as used: the one given or the tangent, made unit
   std::vector<double> points;      // n per point, in the order of the path
   std::vector<double> tangents;    // n per point
   std::vector<std::int32_t> phases;  // flush phase of each point (0 start, 1 along, 2 end)
@@ -48,8 +50,10 @@ struct TraceResult {
 };
 
 // Fills in the defaults of a plan for the system (direction excepted) and checks it: sizes,
-// box, steps, tolerances, start point inside the box and on the curve; sets the system's
-// difference scales from the box. Throws ToolError.
+// box, steps, tolerances, start point inside the box and on the curve (with plan.snap, a
+// start point off the curve is first moved onto it by Gauss-Newton steps of least length:
+// x -= J' (J J')^-1 F, solved by ynsega, at most 50, while the residual sum decreases);
+// sets the system's difference scales from the box. Throws ToolError.
 void check_plan(EquationSystem& system, TracePlan& plan);
 
 // Traces the path of a checked plan. An input error found before the trace (no tangent at
