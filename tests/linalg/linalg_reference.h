@@ -4,6 +4,7 @@
 #include <cmath>
 #include <cstdint>
 #include <cstdlib>
+#include <random>
 #include <utility>
 #include <vector>
 
@@ -41,4 +42,19 @@ inline std::vector<double> by_columns(std::int32_t n, std::initializer_list<doub
   for (std::int32_t i = 0; i < n; ++i)
     for (std::int32_t j = 0; j < n; ++j) c[i + j * n] = r[i * n + j];
   return c;
+}
+
+// n uniform reals in [-1, 1).
+inline std::vector<double> sample(std::mt19937_64& rng, std::int32_t n) {
+  std::uniform_real_distribution<double> u(-1.0, 1.0);
+  std::vector<double> v(static_cast<std::size_t>(n));
+  for (double& x : v) x = u(rng);
+  return v;
+}
+
+// A random matrix of order n made well conditioned by adding sign * n to its diagonal.
+inline std::vector<double> dominant_matrix(std::mt19937_64& rng, std::int32_t n, int sign) {
+  std::vector<double> a = sample(rng, n * n);
+  for (std::int32_t i = 0; i < n; ++i) a[i + i * n] += sign * n;
+  return a;
 }
