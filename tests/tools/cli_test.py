@@ -193,8 +193,8 @@ def case_errors():
     refused([*base, "-e", "x+y"], ["--start is required"])
     refused(["frobnicate"], ["frobnicate"])
     # The solver's own failure: a point limit of the evaluations, reported with exit 1.
-    line = refused([*base, "-e", "x^2 + y^2 - 1", "--start", "1,0", "--max-evals", "5"],
-                   ["the path failed with code", "stopped after 5 evaluations"], code=1)
+    line = refused([*base, "-e", "x^2 + y^2 - 1", "--start", "1,0", "--max-calls", "5"],
+                   ["the path failed with code", "stopped after 5 calls"], code=1)
     assert line.startswith("orvq7 trace:"), line
 
 

@@ -143,7 +143,7 @@ TEST(EvaluateSystem, FailsWith4715AndAReasonInsteadOfThrowing) {
   req = 1;
   EXPECT_EQ(orvq7tool::evaluate_system(&ctx, &npts, x, &req, out, &ierr), 1);  // third call
   EXPECT_EQ(ierr, 4715);
-  EXPECT_NE(ctx.failure.find("stopped after 2 evaluations"), std::string::npos);
+  EXPECT_NE(ctx.failure.find("stopped after 2 calls"), std::string::npos);
 }
 
 }  // namespace

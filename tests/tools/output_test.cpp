@@ -1,5 +1,7 @@
 // tests/tools/output_test.cpp -- checks for tools/orvq7/input.cpp, output.cpp and
 // picture.cpp: typed numbers and ranges, CSV read back to the bit, escaped pictures.
+#include "output.h"
+
 #include <gtest/gtest.h>
 
 #include <cmath>
@@ -8,7 +10,6 @@
 #include <string>
 
 #include "input.h"
-#include "output.h"
 #include "picture.h"
 
 namespace {
@@ -32,8 +33,7 @@ TEST(Input, ListsAndRangesAcceptWhatTheyShouldAndNameWhatTheyRefuse) {
   const auto each = orvq7tool::parse_ranges("0:1,-1:0.5", 2, "box");
   EXPECT_EQ(each.lower, (std::vector<double>{0, -1}));
   EXPECT_EQ(each.upper, (std::vector<double>{1, 0.5}));
-  EXPECT_EQ(error_of([] { orvq7tool::parse_list("1,,2", "start"); }),
-            "start: a number is missing");
+  EXPECT_EQ(error_of([] { orvq7tool::parse_list("1,,2", "start"); }), "start: a number is missing");
   EXPECT_EQ(error_of([] { orvq7tool::parse_list("1,2x", "start"); }),
             "start: '2x' is not a number");
   EXPECT_EQ(error_of([] { orvq7tool::parse_list("1,nan", "start"); }),

@@ -27,8 +27,7 @@ std::vector<double> on_segment(const std::vector<double>& seg, std::size_t n, do
 
 Outcome closest_report(const std::vector<double>& seg, const std::vector<double>& other,
                        bool other_is_line, std::size_t n) {
-  if (n < 2 || n > 1000000)
-    throw ToolError(fmt::format("dimension {}: expected 2 or more", n));
+  if (n < 2 || n > 1000000) throw ToolError(fmt::format("dimension {}: expected 2 or more", n));
   if (seg.size() != 2 * n || other.size() != 2 * n)
     throw ToolError(fmt::format("every point and direction needs {} coordinates", n));
   const std::int32_t dim = static_cast<std::int32_t>(n);
@@ -49,8 +48,7 @@ Outcome closest_report(const std::vector<double>& seg, const std::vector<double>
     double len2 = 0.0;
     for (std::size_t i = 0; i < n; ++i) len2 += line[i] * line[i];
     const double len = std::sqrt(len2);
-    if (!(len > 0.0) || !std::isfinite(len))
-      throw ToolError("line: the direction is zero");
+    if (!(len > 0.0) || !std::isfinite(len)) throw ToolError("line: the direction is zero");
     for (std::size_t i = 0; i < n; ++i) line[i] /= len;
     result = ynoal2(&dim, seg.data(), line.data(), &dist2, &t1, &t2, &ierr);
     p = on_segment(seg, n, t1);

@@ -169,7 +169,7 @@ std::int32_t evaluate_system(void* ctx, const std::int32_t* npts, const double* 
     const std::size_t n = s.unknowns(), m = s.equations();
     ++c.calls;
     if (c.max_calls != 0 && c.calls > c.max_calls) {
-      c.failure = fmt::format("stopped after {} evaluations (the limit; see --max-evals)",
+      c.failure = fmt::format("stopped after {} calls of the evaluation routine (--max-calls)",
                               c.max_calls);
       *ierr = kEvalRefused;
       return 1;

@@ -75,9 +75,9 @@ class EquationSystem {
 // Context of the evaluation routine below: the system, and what happened during a trace.
 struct EvalContext {
   const EquationSystem* system = nullptr;
-  std::uint64_t calls = 0;         // calls of the evaluation routine
-  std::uint64_t max_calls = 0;     // 0: no limit; else the routine fails after that many
-  std::string failure;             // why the routine failed, for the message
+  std::uint64_t calls = 0;      // calls of the evaluation routine
+  std::uint64_t max_calls = 0;  // 0: no limit; else the routine fails after that many
+  std::string failure;          // why the routine failed, for the message
   // Called every 64 calls with the point just evaluated (progress line); may be empty.
   void (*progress)(void* user, std::uint64_t calls, const double* x) = nullptr;
   void* progress_user = nullptr;

@@ -41,13 +41,15 @@ Outcome fit_report(const std::vector<double>& xyz, double tol) {
   if (plmoyn(xyz.data(), &ld, &n, &tol, &a, &b, &c, &d, &e) == 0) {
     o.text += fmt::format("mean plane  {:.10g} x {} {:.10g} y {} {:.10g} z {} {:.10g} = 0\n", a,
                           sign(b), std::fabs(b), sign(c), std::fabs(c), sign(d), std::fabs(d));
-    o.text += fmt::format("            half-thickness {:.6g} (every point within it of the "
-                          "plane)\n",
-                          e);
+    o.text += fmt::format(
+        "            half-thickness {:.6g} (every point within it of the "
+        "plane)\n",
+        e);
   } else if (!std::isnan(e)) {
-    o.text += fmt::format("mean plane  none: the points lie along a line (largest squared "
-                          "distance {:.3g})\n",
-                          e);
+    o.text += fmt::format(
+        "mean plane  none: the points lie along a line (largest squared "
+        "distance {:.3g})\n",
+        e);
   } else {
     o.text += "mean plane  none: no unique plane (points on a line or coincident)\n";
   }
@@ -57,12 +59,11 @@ Outcome fit_report(const std::vector<double>& xyz, double tol) {
     double far2 = 0.0;
     std::int32_t k = 0;
     ecrdrt(xyz.data(), &ld, &n, line, &far2, &k);
-    o.text += fmt::format("mean line   direction ({:.10g}, {:.10g}, {:.10g})\n", line[0],
-                          line[1], line[2]);
-    o.text += fmt::format("            through ({:.10g}, {:.10g}, {:.10g})\n", line[3], line[4],
-                          line[5]);
-    o.text += fmt::format("            farthest point {} at distance {:.6g}\n", k,
-                          std::sqrt(far2));
+    o.text += fmt::format("mean line   direction ({:.10g}, {:.10g}, {:.10g})\n", line[0], line[1],
+                          line[2]);
+    o.text +=
+        fmt::format("            through ({:.10g}, {:.10g}, {:.10g})\n", line[3], line[4], line[5]);
+    o.text += fmt::format("            farthest point {} at distance {:.6g}\n", k, std::sqrt(far2));
   } else {
     o.text += "mean line   none: the largest spread is not in one direction\n";
   }

@@ -18,7 +18,7 @@ namespace orvq7tool {
 namespace {
 
 struct GalleryCurve {
-  std::string name;   // stem of the files
+  std::string name;  // stem of the files
   std::string title;
   std::vector<std::string> names;
   std::vector<std::string> equations;
@@ -28,6 +28,7 @@ struct GalleryCurve {
   std::vector<double> tol;  // empty: the default of the kind
 };
 
+// clang-format off
 const std::vector<GalleryCurve>& gallery_curves() {
   static const std::vector<GalleryCurve> curves = {
       {"circle", "A circle that closes on its start", {"x", "y"}, {"x^2 + y^2 - 1"},
@@ -44,6 +45,7 @@ const std::vector<GalleryCurve>& gallery_curves() {
   };
   return curves;
 }
+// clang-format on
 
 struct GalleryPolynomial {
   std::vector<double> coef;
@@ -52,7 +54,7 @@ struct GalleryPolynomial {
 
 const std::vector<GalleryPolynomial>& gallery_polynomials() {
   static const std::vector<GalleryPolynomial> polys = {
-      {{1, -6, 11, -6}, "ynzenr"},  // (x - 1)(x - 2)(x - 3)
+      {{1, -6, 11, -6}, "ynzenr"},    // (x - 1)(x - 2)(x - 3)
       {{1, 0, -10, 0, 9}, "ynzenr"},  // (x^2 - 1)(x^2 - 9)
       {{1, 2, 5}, "duos"},            // roots -1 +- 2i
       {{1, -2, -1, 2}, "tresor"},     // (x - 2)(x - 1)(x + 1)

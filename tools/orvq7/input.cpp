@@ -71,8 +71,8 @@ std::vector<std::string> parse_names(std::string_view text, std::string_view wha
     const std::string_view name = trim(item);
     bool ok = !name.empty() && !std::isdigit(static_cast<unsigned char>(name.front()));
     for (char c : name) ok = ok && (std::isalnum(static_cast<unsigned char>(c)) || c == '_');
-    if (!ok) throw ToolError(fmt::format("{}: {} is not a name (letters, digits, _)", what,
-                                         quote(item)));
+    if (!ok)
+      throw ToolError(fmt::format("{}: {} is not a name (letters, digits, _)", what, quote(item)));
     for (const std::string& seen : names)
       if (seen == name) throw ToolError(fmt::format("{}: {} appears twice", what, quote(name)));
     names.emplace_back(name);
@@ -83,8 +83,8 @@ std::vector<std::string> parse_names(std::string_view text, std::string_view wha
 Ranges parse_ranges(std::string_view text, std::size_t n, std::string_view what) {
   const std::vector<std::string_view> items = split(text, ',');
   if (items.size() != 1 && items.size() != n)
-    throw ToolError(fmt::format("{}: {} ranges given, expected 1 or {} (lo:hi each)", what,
-                                items.size(), n));
+    throw ToolError(
+        fmt::format("{}: {} ranges given, expected 1 or {} (lo:hi each)", what, items.size(), n));
   Ranges r;
   for (std::size_t i = 0; i < n; ++i) {
     const std::string_view item = items.size() == 1 ? items[0] : items[i];
@@ -92,8 +92,7 @@ Ranges parse_ranges(std::string_view text, std::size_t n, std::string_view what)
     if (ends.size() != 2)
       throw ToolError(fmt::format("{}: {} is not a range lo:hi", what, quote(item)));
     const double lo = parse_real(ends[0], what), hi = parse_real(ends[1], what);
-    if (!(lo < hi))
-      throw ToolError(fmt::format("{}: range {} has lo >= hi", what, quote(item)));
+    if (!(lo < hi)) throw ToolError(fmt::format("{}: range {} has lo >= hi", what, quote(item)));
     r.lower.push_back(lo);
     r.upper.push_back(hi);
   }
@@ -122,8 +121,8 @@ CsvTable read_csv(std::string_view text, std::string_view source) {
       }
     }
     if (fields.size() != table.columns)
-      throw ToolError(fmt::format("{}:{}: {} fields, expected {}", source, line_no,
-                                  fields.size(), table.columns));
+      throw ToolError(fmt::format("{}:{}: {} fields, expected {}", source, line_no, fields.size(),
+                                  table.columns));
     std::vector<double> row;
     for (std::size_t k = 0; k < fields.size(); ++k)
       row.push_back(parse_real(fields[k], fmt::format("{}:{}: field {}", source, line_no, k + 1)));

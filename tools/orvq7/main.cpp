@@ -4,9 +4,9 @@
 //
 // Exit status: 0 success; 1 a library routine reported a failure; 2 bad input (one line on
 // standard error naming the problem).
-#include <CLI/CLI.hpp>
 #include <fmt/format.h>
 
+#include <CLI/CLI.hpp>
 #include <cstdio>
 #include <exception>
 #include <string>
@@ -31,7 +31,7 @@ struct TraceArgs {
   std::int32_t kind = 4;
   bool order2 = false, no_turn_test = false, json = false, quiet = false, snap = false;
   double eps = 1e-20, progress = 1.0;
-  std::uint64_t max_evals = 2000000;
+  std::uint64_t max_calls = 2000000;
 };
 
 // An axis given by name or by number from 1.
@@ -41,8 +41,8 @@ std::size_t axis_index(const std::string& text, const std::vector<std::string>& 
   const double v = parse_real(text, "axes");
   if (v >= 1 && v <= static_cast<double>(names.size()) && v == std::floor(v))
     return static_cast<std::size_t>(v) - 1;
-  throw ToolError(fmt::format("axes: '{}' is neither an unknown nor a number 1 to {}", text,
-                              names.size()));
+  throw ToolError(
+      fmt::format("axes: '{}' is neither an unknown nor a number 1 to {}", text, names.size()));
 }
 
 int run_trace(const TraceArgs& a) {
@@ -69,7 +69,7 @@ int run_trace(const TraceArgs& a) {
   plan.turn_test = !a.no_turn_test;
   plan.eps = a.eps;
   plan.snap = a.snap;
-  plan.max_evals = a.max_evals;
+  plan.max_calls = a.max_calls;
   plan.progress_after = a.quiet ? -1.0 : a.progress;
   plan.progress_name = a.name;
   const std::size_t comma = a.axes.find(',');
@@ -126,16 +126,17 @@ int print_outcome(const Outcome& o) {
 std::vector<double> join_points(const std::vector<std::string>& pair, const char* what) {
   std::vector<double> a = parse_list(pair.at(0), what), b = parse_list(pair.at(1), what);
   if (a.size() != b.size())
-    throw ToolError(fmt::format("{}: the two points have {} and {} coordinates", what, a.size(),
-                                b.size()));
+    throw ToolError(
+        fmt::format("{}: the two points have {} and {} coordinates", what, a.size(), b.size()));
   a.insert(a.end(), b.begin(), b.end());
   return a;
 }
 
 int run(int argc, char** argv) {
-  CLI::App app{"orvq7 -- demonstration program of OrvQ7Maths. With no arguments it runs the "
-               "gallery: curves traced, polynomials solved, a plane fitted, closest points, "
-               "written as text and SVG pictures into a folder."};
+  CLI::App app{
+      "orvq7 -- demonstration program of OrvQ7Maths. With no arguments it runs the "
+      "gallery: curves traced, polynomials solved, a plane fitted, closest points, "
+      "written as text and SVG pictures into a folder."};
   app.set_version_flag("--version", std::string("orvq7 ") + orvq7_version_text());
   app.require_subcommand(0, 1);
   std::string gallery_out = "orvq7-gallery";
@@ -151,11 +152,13 @@ int run(int argc, char** argv) {
   TraceArgs ta;
   auto* trace = app.add_subcommand(
       "trace", "trace the curve of n-1 equations in n unknowns from a start point");
-  trace->add_option("-e,--eq", ta.equations,
-                    "an equation, 'expr' (= 0) or 'lhs = rhs'; give n-1 of them")
+  trace
+      ->add_option("-e,--eq", ta.equations,
+                   "an equation, 'expr' (= 0) or 'lhs = rhs'; give n-1 of them")
       ->required();
-  trace->add_option("--vars", ta.vars, "names of the unknowns, comma-separated "
-                                       "(default x,y / x,y,z / x1..xn)");
+  trace->add_option("--vars", ta.vars,
+                    "names of the unknowns, comma-separated "
+                    "(default x,y / x,y,z / x1..xn)");
   trace->add_option("--start", ta.start, "start point on the curve, n values")->required();
   trace->add_option("--dir", ta.dir, "start direction, n values (default: the tangent)");
   trace->add_option("--box", ta.box, "lo:hi per unknown, comma-separated, or one for all")
@@ -165,9 +168,10 @@ int run(int argc, char** argv) {
   trace->add_option("--tol", ta.tol,
                     "path tolerance, 1 or n values (default by kind: 2 width/100, "
                     "4 width/4000, 8 0.1)");
-  trace->add_option("--kind", ta.kind,
-                    "path kind: 2 steps of at most 0.9 tol; 4 chords within about tol/5 of the "
-                    "curve; 8 tangent turning by about 0.9 tol radians per step")
+  trace
+      ->add_option("--kind", ta.kind,
+                   "path kind: 2 steps of at most 0.9 tol; 4 chords within about tol/5 of the "
+                   "curve; 8 tangent turning by about 0.9 tol radians per step")
       ->check(CLI::IsMember({2, 4, 8}))
       ->capture_default_str();
   trace->add_flag("--secant-curvature", ta.order2,
@@ -181,10 +185,11 @@ int run(int argc, char** argv) {
   trace->add_option("--out", ta.out, "folder to write into")->capture_default_str();
   trace->add_option("--name", ta.name, "stem of the files written")->capture_default_str();
   trace->add_flag("--json", ta.json, "write the points as JSON instead of CSV");
-  trace->add_option("--max-evals", ta.max_evals, "stop after this many evaluations (0: none)")
+  trace
+      ->add_option("--max-calls", ta.max_calls,
+                   "stop after this many calls of the evaluation routine (0: none)")
       ->capture_default_str();
-  trace->add_option("--progress", ta.progress,
-                    "seconds before a progress line (negative: none)")
+  trace->add_option("--progress", ta.progress, "seconds before a progress line (negative: none)")
       ->capture_default_str();
   trace->add_flag("--quiet", ta.quiet, "no progress line");
 
@@ -193,8 +198,7 @@ int run(int argc, char** argv) {
   std::int32_t cardan_mode = 1;
   auto* roots = app.add_subcommand("roots", "roots of a polynomial of degree 1 to 4");
   roots->add_option("coefficients", coef_text, "coefficients by decreasing power")->required();
-  roots->add_option("--solver", solver,
-                    fmt::format("solver: {}", fmt::join(root_solvers(), ", ")))
+  roots->add_option("--solver", solver, fmt::format("solver: {}", fmt::join(root_solvers(), ", ")))
       ->capture_default_str();
   roots->add_option("--mode", cardan_mode, "cardan's mode: 1 all roots, 2 the first only")
       ->capture_default_str();
@@ -206,8 +210,9 @@ int run(int argc, char** argv) {
   fit->add_option("--tol", fit_tol, "tolerance of the fit")->capture_default_str();
 
   std::vector<std::string> seg1, seg2, line;
-  auto* closest = app.add_subcommand("closest", "closest pair of two segments, or of a segment "
-                                                "and a line, in any dimension");
+  auto* closest = app.add_subcommand("closest",
+                                     "closest pair of two segments, or of a segment "
+                                     "and a line, in any dimension");
   closest->add_option("--seg1", seg1, "first segment: two points, each comma-separated")
       ->expected(2)
       ->required();

@@ -41,10 +41,14 @@ std::string json_strings(const std::vector<std::string>& values) {
 
 std::string ending_word(Ending e) {
   switch (e) {
-    case Ending::kClosed: return "closed";
-    case Ending::kLeftBox: return "left_box";
-    case Ending::kInside: return "inside";
-    case Ending::kFailed: break;
+    case Ending::kClosed:
+      return "closed";
+    case Ending::kLeftBox:
+      return "left_box";
+    case Ending::kInside:
+      return "inside";
+    case Ending::kFailed:
+      break;
   }
   return "failed";
 }
@@ -73,8 +77,7 @@ std::string points_csv(const EquationSystem& system, const TraceResult& r) {
   return s;
 }
 
-std::string points_json(const EquationSystem& system, const TracePlan& plan,
-                        const TraceResult& r) {
+std::string points_json(const EquationSystem& system, const TracePlan& plan, const TraceResult& r) {
   const std::size_t n = r.n;
   std::string s = "{\n";
   s += fmt::format("  \"unknowns\": {},\n", json_strings(system.names()));
@@ -101,8 +104,8 @@ std::string points_json(const EquationSystem& system, const TracePlan& plan,
   return s;
 }
 
-Picture trace_picture(const EquationSystem& system, const TracePlan& plan,
-                      const TraceResult& r, std::size_t ax, std::size_t ay) {
+Picture trace_picture(const EquationSystem& system, const TracePlan& plan, const TraceResult& r,
+                      std::size_t ax, std::size_t ay) {
   const std::size_t n = r.n;
   const auto& names = system.names();
   Picture p;
@@ -111,10 +114,11 @@ Picture trace_picture(const EquationSystem& system, const TracePlan& plan,
   for (std::size_t k = 0; k < system.equations(); ++k)
     eqs += (eqs.empty() ? "" : ";  ") + system.shown(k);
   p.caption.push_back(eqs);
-  p.caption.push_back(fmt::format("{} points, length {:.6g}; {}", r.count(), r.length,
-                                  r.ending_text));
-  if (n > 2) p.caption.push_back(fmt::format("projection on ({}, {}) of {} unknowns",
-                                             names[ax], names[ay], n));
+  p.caption.push_back(
+      fmt::format("{} points, length {:.6g}; {}", r.count(), r.length, r.ending_text));
+  if (n > 2)
+    p.caption.push_back(
+        fmt::format("projection on ({}, {}) of {} unknowns", names[ax], names[ay], n));
   p.xlabel = names[ax];
   p.ylabel = names[ay];
   p.xmin = plan.lower[ax];
@@ -151,12 +155,12 @@ std::string trace_report(const EquationSystem& system, const TracePlan& plan,
     s += fmt::format("  equation   {}\n", system.shown(k));
   std::string box;
   for (std::size_t i = 0; i < n; ++i)
-    box += fmt::format("{}{} in [{}, {}]", i == 0 ? "" : ", ", names[i], plan.lower[i],
-                       plan.upper[i]);
+    box +=
+        fmt::format("{}{} in [{}, {}]", i == 0 ? "" : ", ", names[i], plan.lower[i], plan.upper[i]);
   s += fmt::format("  box        {}\n", box);
-  s += fmt::format("  start      {}{}\n", point_text(names, plan.start.data(), n),
-                   plan.snapped > 0.0 ? fmt::format(", moved {:.3g} onto the curve", plan.snapped)
-                                      : "");
+  s += fmt::format(
+      "  start      {}{}\n", point_text(names, plan.start.data(), n),
+      plan.snapped > 0.0 ? fmt::format(", moved {:.3g} onto the curve", plan.snapped) : "");
   if (r.direction.size() == n)
     s += fmt::format("  direction  {}\n", point_text(names, r.direction.data(), n));
   s += fmt::format("  path kind  {}, tolerance {}{}\n", plan.kind, fmt::join(plan.tol, ", "),
@@ -164,13 +168,11 @@ std::string trace_report(const EquationSystem& system, const TracePlan& plan,
   s += fmt::format("  ending     {}\n", r.ending_text);
   if (r.ending != Ending::kFailed) {
     s += fmt::format("  points     {}, length {:.10g}\n", r.count(), r.length);
-    s += fmt::format("  end        {}\n",
-                     point_text(names, &r.points[(r.count() - 1) * n], n));
+    s += fmt::format("  end        {}\n", point_text(names, &r.points[(r.count() - 1) * n], n));
     double worst = 0.0;
     for (std::size_t j = 0; j < r.count(); ++j)
       worst = std::max(worst, system.residual_sum(&r.points[j * n]));
-    s += fmt::format("  residuals  largest sum of squares {:.3g} (eps {:.3g})\n", worst,
-                     plan.eps);
+    s += fmt::format("  residuals  largest sum of squares {:.3g} (eps {:.3g})\n", worst, plan.eps);
   }
   s += fmt::format("  effort     {} calls of the evaluation routine, {} evaluations, {:.3f} s\n",
                    r.calls, r.evaluations, r.seconds);
@@ -183,8 +185,8 @@ std::filesystem::path prepare_folder(const std::string& folder) {
   if (std::filesystem::exists(path, ec) && !std::filesystem::is_directory(path, ec))
     throw ToolError(fmt::format("{}: exists and is not a folder", path.string()));
   std::filesystem::create_directories(path, ec);
-  if (ec) throw ToolError(fmt::format("{}: cannot create the folder ({})", path.string(),
-                                      ec.message()));
+  if (ec)
+    throw ToolError(fmt::format("{}: cannot create the folder ({})", path.string(), ec.message()));
   return path;
 }
 

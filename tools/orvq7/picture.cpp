@@ -11,14 +11,14 @@ namespace {
 
 constexpr double kWidth = 640.0;
 constexpr double kPlotLeft = 80.0, kPlotRight = 40.0, kPlotBottom = 60.0;
-constexpr double kLine = 18.0;              // height of a line of text
-constexpr double kMaxRatio = 4.0;          // beyond this ratio the axes get separate scales
-constexpr std::size_t kMaxDots = 400;       // more points than this: the line alone
-constexpr double kArrow = 36.0;             // length of the start-direction arrow, pixels
+constexpr double kLine = 18.0;         // height of a line of text
+constexpr double kMaxRatio = 4.0;      // beyond this ratio the axes get separate scales
+constexpr std::size_t kMaxDots = 400;  // more points than this: the line alone
+constexpr double kArrow = 36.0;        // length of the start-direction arrow, pixels
 
 // Numbers of the picture, short and without a trailing ".0".
 std::string num(double v) { return fmt::format("{:.6g}", v); }
-std::string px(double v) { return fmt::format("{:.2f}", v); }
+std::string px(double v) { return fmt::format("{:.1f}", v); }
 
 }  // namespace
 
@@ -26,11 +26,21 @@ std::string xml_escape(const std::string& text) {
   std::string out;
   for (char c : text) {
     switch (c) {
-      case '&': out += "&amp;"; break;
-      case '<': out += "&lt;"; break;
-      case '>': out += "&gt;"; break;
-      case '"': out += "&quot;"; break;
-      case '\'': out += "&apos;"; break;
+      case '&':
+        out += "&amp;";
+        break;
+      case '<':
+        out += "&lt;";
+        break;
+      case '>':
+        out += "&gt;";
+        break;
+      case '"':
+        out += "&quot;";
+        break;
+      case '\'':
+        out += "&apos;";
+        break;
       default:
         // Control characters are not allowed in XML 1.0 text.
         out += (static_cast<unsigned char>(c) < 0x20 && c != '\n' && c != '\t') ? ' ' : c;
@@ -69,8 +79,7 @@ std::string render_svg(const Picture& p) {
   s += "<defs><marker id=\"arrow\" viewBox=\"0 0 10 10\" refX=\"9\" refY=\"5\" "
        "markerWidth=\"7\" markerHeight=\"7\" orient=\"auto\"><path d=\"M0,0 L10,5 L0,10 z\" "
        "fill=\"#2e8b3e\"/></marker></defs>\n";
-  s += fmt::format("<rect width=\"{}\" height=\"{}\" fill=\"#ffffff\"/>\n", px(kWidth),
-                   px(height));
+  s += fmt::format("<rect width=\"{}\" height=\"{}\" fill=\"#ffffff\"/>\n", px(kWidth), px(height));
   s += fmt::format("<text x=\"20\" y=\"30\" font-size=\"17\" font-weight=\"bold\">{}</text>\n",
                    xml_escape(p.title));
   for (std::size_t i = 0; i < p.caption.size(); ++i)
@@ -93,14 +102,13 @@ std::string render_svg(const Picture& p) {
   s += fmt::format(
       "<text x=\"{}\" y=\"{}\" text-anchor=\"middle\" font-style=\"italic\">{}</text>\n",
       px((bx0 + bx1) / 2), px(by1 + 36), xml_escape(p.xlabel));
-  s += fmt::format(
-      "<text x=\"{}\" y=\"{}\" text-anchor=\"end\" font-style=\"italic\">{}</text>\n",
-      px(bx0 - 6), px((by0 + by1) / 2), xml_escape(p.ylabel));
+  s += fmt::format("<text x=\"{}\" y=\"{}\" text-anchor=\"end\" font-style=\"italic\">{}</text>\n",
+                   px(bx0 - 6), px((by0 + by1) / 2), xml_escape(p.ylabel));
 
   // The face through which the path left, when it is one of the four edges shown.
   if (p.exit_edge >= 0 && p.exit_edge <= 3) {
-    const double e[4][4] = {{bx0, by0, bx0, by1}, {bx1, by0, bx1, by1},
-                            {bx0, by1, bx1, by1}, {bx0, by0, bx1, by0}};
+    const double e[4][4] = {
+        {bx0, by0, bx0, by1}, {bx1, by0, bx1, by1}, {bx0, by1, bx1, by1}, {bx0, by0, bx1, by0}};
     const double* q = e[p.exit_edge];
     s += fmt::format(
         "<line x1=\"{}\" y1=\"{}\" x2=\"{}\" y2=\"{}\" stroke=\"#d62728\" stroke-width=\"4\"/>\n",
@@ -123,8 +131,7 @@ std::string render_svg(const Picture& p) {
     s += "<g fill=\"#1f5fbf\">";
     for (std::size_t i = 0; i < count; ++i)
       if (std::isfinite(p.xs[i]) && std::isfinite(p.ys[i]))
-        s += fmt::format("<circle cx=\"{}\" cy=\"{}\" r=\"1.6\"/>", px(X(p.xs[i])),
-                         px(Y(p.ys[i])));
+        s += fmt::format("<circle cx=\"{}\" cy=\"{}\" r=\"1.6\"/>", px(X(p.xs[i])), px(Y(p.ys[i])));
     s += "</g>\n";
   }
 
@@ -147,7 +154,9 @@ std::string render_svg(const Picture& p) {
         px(x0), px(y0));
     s += fmt::format("<text x=\"{}\" y=\"{}\" fill=\"#2e8b3e\" text-anchor=\"{}\">start</text>\n",
                      px(x0 + 14 * ux), px(y0 + 14 * uy + 4 + 6 * std::fabs(uy)),
-                     ux > 0.3 ? "start" : ux < -0.3 ? "end" : "middle");
+                     ux > 0.3    ? "start"
+                     : ux < -0.3 ? "end"
+                                 : "middle");
   }
   if (count > 0) {
     const double xe = X(p.xs[count - 1]), ye = Y(p.ys[count - 1]);

@@ -55,38 +55,58 @@ double residual(const std::vector<double>& c, double re, double im) {
 std::string flag_text(const std::string& solver, std::int32_t flag) {
   if (solver == "duos") {
     switch (flag) {
-      case 0: return "two real roots";
-      case 1: return "no solution (c0 = c1 = 0, c2 != 0)";
-      case 2: return "every x is a solution (all coefficients 0)";
-      case 3: return "linear (c0 = 0): one root, in both slots";
-      case 4: return "a pair of complex conjugate roots";
+      case 0:
+        return "two real roots";
+      case 1:
+        return "no solution (c0 = c1 = 0, c2 != 0)";
+      case 2:
+        return "every x is a solution (all coefficients 0)";
+      case 3:
+        return "linear (c0 = 0): one root, in both slots";
+      case 4:
+        return "a pair of complex conjugate roots";
     }
   } else if (solver == "cardan") {
     switch (flag) {
-      case 1: return "one real root and a complex pair";
-      case 2: return "leading coefficient below 1e-15: solved as a quadratic";
-      case 3: return "three real roots";
+      case 1:
+        return "one real root and a complex pair";
+      case 2:
+        return "leading coefficient below 1e-15: solved as a quadratic";
+      case 3:
+        return "three real roots";
     }
   } else if (solver == "ferari") {
     if (flag == 0) return "four roots";
     if (flag == 3) return "leading coefficient below 1e-15: nothing computed";
   } else if (solver == "quadr") {
     switch (flag) {
-      case 0: return "four roots";
-      case 1: return "four roots (negative resolvent root, sign discarded)";
-      case 3: return "leading coefficient 0: nothing computed";
-      case 11: return "Newton reached its count on the resolvent";
-      case 12: return "zero derivative met in the resolvent's Newton";
-      case 13: return "degenerate resolvent";
-      case 33: return "huge resolvent coefficients";
+      case 0:
+        return "four roots";
+      case 1:
+        return "four roots (negative resolvent root, sign discarded)";
+      case 3:
+        return "leading coefficient 0: nothing computed";
+      case 11:
+        return "Newton reached its count on the resolvent";
+      case 12:
+        return "zero derivative met in the resolvent's Newton";
+      case 13:
+        return "degenerate resolvent";
+      case 33:
+        return "huge resolvent coefficients";
     }
   } else if (solver == "tresor") {
     switch (flag) {
-      case 0: return "success";
-      case 11: return "Newton reached its count";
-      case 12: return "zero derivative met in Newton";
-      case 13: return "degenerate quadratic";
-      case 33: return "huge coefficients: Newton's result";
+      case 0:
+        return "success";
+      case 11:
+        return "Newton reached its count";
+      case 12:
+        return "zero derivative met in Newton";
+      case 13:
+        return "degenerate quadratic";
+      case 33:
+        return "huge coefficients: Newton's result";
     }
   }
   return flag == 0 ? "success" : "see the solver's documentation";
@@ -105,12 +125,13 @@ Outcome roots_report(const std::vector<double>& coef, const std::string& solver,
   bool known = false;
   for (const std::string& s : root_solvers()) known = known || s == solver;
   if (!known)
-    throw ToolError(fmt::format("unknown solver '{}' (one of {})", solver,
-                                fmt::join(root_solvers(), ", ")));
+    throw ToolError(
+        fmt::format("unknown solver '{}' (one of {})", solver, fmt::join(root_solvers(), ", ")));
   if (coef.size() < 2 || coef.size() > 5)
-    throw ToolError(fmt::format("{} coefficients: degree {} is out of range (1 to 4, so 2 to 5 "
-                                "coefficients)",
-                                coef.size(), static_cast<long>(coef.size()) - 1));
+    throw ToolError(
+        fmt::format("{} coefficients: degree {} is out of range (1 to 4, so 2 to 5 "
+                    "coefficients)",
+                    coef.size(), static_cast<long>(coef.size()) - 1));
   const std::size_t need = coefficients_of(solver);
   if (need != 0 && coef.size() != need)
     throw ToolError(fmt::format("{} takes {} coefficients (degree {}), got {}", solver, need,
@@ -126,11 +147,10 @@ Outcome roots_report(const std::vector<double>& coef, const std::string& solver,
     result = ynzenr(&n, coef.data(), &nroots, roots, &flag);
     slots = result == 0 ? nroots : 0;
     status = fmt::format("result {}, code {}{}, degree solved {}", result, flag,
-                         result == 0 ? "" : fmt::format(" ({})", flag_text(solver, flag)),
-                         nroots);
+                         result == 0 ? "" : fmt::format(" ({})", flag_text(solver, flag)), nroots);
   } else if (solver == "ynze2r" || solver == "ynze3r") {
-    result = solver == "ynze2r" ? ynze2r(coef.data(), roots, &flag)
-                                : ynze3r(coef.data(), roots, &flag);
+    result =
+        solver == "ynze2r" ? ynze2r(coef.data(), roots, &flag) : ynze3r(coef.data(), roots, &flag);
     slots = result == 0 ? static_cast<std::int32_t>(need) - 1 : 0;
     status = fmt::format("result {}, code {}{}", result, flag,
                          flag == 4709 ? " (leading coefficient 0)" : "");
@@ -162,8 +182,8 @@ Outcome roots_report(const std::vector<double>& coef, const std::string& solver,
   o.text += fmt::format("solver      {}: {}\n", solver, status);
   for (std::int32_t k = 0; k < slots; ++k) {
     const double re = roots[2 * k], im = roots[2 * k + 1];
-    o.text += fmt::format("root {}      {:<44} |p(root)| = {:.3g}\n", k + 1,
-                          complex_text(re, im), residual(coef, re, im));
+    o.text += fmt::format("root {}      {:<44} |p(root)| = {:.3g}\n", k + 1, complex_text(re, im),
+                          residual(coef, re, im));
   }
   if (o.ok && slots == 0) o.text += "no roots\n";
   if (solver == "ynzenr" && o.ok && slots == 1)

@@ -101,15 +101,14 @@ std::string code_text(std::int32_t code) {
 }
 
 // All entries of the quantity of record kind `kind`, as raw bytes of `esize` per entry.
-std::vector<unsigned char> read_quantity(std::int32_t itab, std::int32_t kind,
-                                         std::int32_t esize, std::int32_t* count) {
+std::vector<unsigned char> read_quantity(std::int32_t itab, std::int32_t kind, std::int32_t esize,
+                                         std::int32_t* count) {
   std::int32_t handle = 0, ierr = 0, size = 0, entries = 0;
   *count = 0;
   if (yncrea(&itab, &kind, &handle, count, &ierr) == 1 || handle == 0)
     throw ToolError(fmt::format("the result holds no quantity of record kind {}", kind));
   if (yutinf(&handle, &size, &entries, &ierr) == 1 || size != esize || entries < *count)
-    throw ToolError(fmt::format("the result's record kind {} has entries of {} bytes", kind,
-                                size));
+    throw ToolError(fmt::format("the result's record kind {} has entries of {} bytes", kind, size));
   std::vector<unsigned char> bytes(static_cast<std::size_t>(*count) * esize);
   const std::int32_t first = 1;
   if (*count > 0 && yutrea(&handle, &first, count, bytes.data(), &ierr) == 1)
@@ -175,15 +174,16 @@ std::vector<std::string> default_names(std::size_t n) {
 void check_plan(EquationSystem& system, TracePlan& plan) {
   const std::size_t n = system.unknowns(), m = system.equations();
   if (m + 1 != n)
-    throw ToolError(fmt::format("{} equations in {} unknowns: a curve needs n - 1 equations in "
-                                "n unknowns",
-                                m, n));
+    throw ToolError(
+        fmt::format("{} equations in {} unknowns: a curve needs n - 1 equations in "
+                    "n unknowns",
+                    m, n));
   if (n < 2 || n > static_cast<std::size_t>(kMaxUnknowns))
     throw ToolError(fmt::format("{} unknowns: the solver takes 2 to {}", n, kMaxUnknowns));
   auto need = [n](const std::vector<double>& v, const char* what) {
     if (v.size() != n)
-      throw ToolError(fmt::format("{}: {} values given, expected {} (one per unknown)", what,
-                                  v.size(), n));
+      throw ToolError(
+          fmt::format("{}: {} values given, expected {} (one per unknown)", what, v.size(), n));
   };
   need(plan.start, "start point");
   need(plan.lower, "box");
@@ -219,8 +219,8 @@ void check_plan(EquationSystem& system, TracePlan& plan) {
                                   system.names()[i], plan.step_min[i], plan.step_max[i]));
   if (plan.tol.empty()) plan.tol.push_back(default_tol(plan.kind, wmin));
   if (plan.tol.size() != 1 && plan.tol.size() != n)
-    throw ToolError(fmt::format("tolerance: {} values given, expected 1 or {}", plan.tol.size(),
-                                n));
+    throw ToolError(
+        fmt::format("tolerance: {} values given, expected 1 or {}", plan.tol.size(), n));
   if (plan.tol.size() == n && n > 1 && plan.kind == 8)
     throw ToolError("path kind 8 takes a single tolerance");
   for (double t : plan.tol)
@@ -230,8 +230,7 @@ void check_plan(EquationSystem& system, TracePlan& plan) {
   for (std::size_t i = 0; i < n; ++i)
     if (plan.start[i] < plan.lower[i] || plan.start[i] > plan.upper[i])
       throw ToolError(fmt::format("start point: {} = {} lies outside its box range {}:{}",
-                                  system.names()[i], plan.start[i], plan.lower[i],
-                                  plan.upper[i]));
+                                  system.names()[i], plan.start[i], plan.lower[i], plan.upper[i]));
   double moved = 0.0;
   double r = system.residual_sum(plan.start.data());
   if (plan.snap && r > plan.eps && std::isfinite(r)) {
@@ -241,19 +240,20 @@ void check_plan(EquationSystem& system, TracePlan& plan) {
     moved = std::sqrt(moved);
     for (std::size_t i = 0; i < n; ++i)
       if (x[i] < plan.lower[i] || x[i] > plan.upper[i])
-        throw ToolError(fmt::format("start point: moved onto the curve, {} = {} lies outside "
-                                    "its box range {}:{}",
-                                    system.names()[i], x[i], plan.lower[i], plan.upper[i]));
+        throw ToolError(
+            fmt::format("start point: moved onto the curve, {} = {} lies outside "
+                        "its box range {}:{}",
+                        system.names()[i], x[i], plan.lower[i], plan.upper[i]));
     plan.start = x;
     r = system.residual_sum(plan.start.data());
   }
   if (!std::isfinite(r))
     throw ToolError("start point: the equations give no number there (NaN or infinite)");
   if (r > plan.eps)
-    throw ToolError(fmt::format("start point is off the curve: sum of squared residuals {:.3g} "
-                                "> eps {:.3g}{}",
-                                r, plan.eps,
-                                plan.snap ? " after snapping" : " (--snap moves it onto it)"));
+    throw ToolError(
+        fmt::format("start point is off the curve: sum of squared residuals {:.3g} "
+                    "> eps {:.3g}{}",
+                    r, plan.eps, plan.snap ? " after snapping" : " (--snap moves it onto it)"));
   plan.snapped = moved;
 }
 
@@ -269,7 +269,7 @@ TraceResult trace_path(const EquationSystem& system, const TracePlan& plan) {
   progress.names = &system.names();
   EvalContext ctx;
   ctx.system = &system;
-  ctx.max_calls = plan.max_evals;
+  ctx.max_calls = plan.max_calls;
   ctx.progress = &Progress::report;
   ctx.progress_user = &progress;
   const std::uint64_t evaluations0 = system.evaluations();
@@ -281,11 +281,9 @@ TraceResult trace_path(const EquationSystem& system, const TracePlan& plan) {
     const std::int32_t npts = 1, req = 2;
     std::int32_t ierr = 0;
     orvq7sys_trace_clear();
-    if (ynumde(&ctx, &n, evaluate_system, &npts, plan.start.data(), &req, t.data(), &ierr) ==
-        1)
-      throw ToolError(fmt::format("no tangent at the start point ({}: {}); give a direction",
-                                  ierr, ierr == kNoTangent ? "degenerate derivatives"
-                                                           : code_text(ierr)));
+    if (ynumde(&ctx, &n, evaluate_system, &npts, plan.start.data(), &req, t.data(), &ierr) == 1)
+      throw ToolError(fmt::format("no tangent at the start point ({}: {}); give a direction", ierr,
+                                  ierr == kNoTangent ? "degenerate derivatives" : code_text(ierr)));
     r.direction = t;
   }
   // The driver takes d0 as the first tangent, length included: give it unit length.
@@ -297,10 +295,10 @@ TraceResult trace_path(const EquationSystem& system, const TracePlan& plan) {
   for (std::size_t i = 0; i < r.n; ++i) {
     if ((plan.start[i] == plan.lower[i] && r.direction[i] < 0.0) ||
         (plan.start[i] == plan.upper[i] && r.direction[i] > 0.0))
-      throw ToolError(fmt::format("the start direction leaves the box at once ({} = {} is on "
-                                  "its {} bound)",
-                                  system.names()[i], plan.start[i],
-                                  r.direction[i] < 0.0 ? "lower" : "upper"));
+      throw ToolError(
+          fmt::format("the start direction leaves the box at once ({} = {} is on "
+                      "its {} bound)",
+                      system.names()[i], plan.start[i], r.direction[i] < 0.0 ? "lower" : "upper"));
   }
 
   std::vector<double> xd(plan.start), box(plan.lower), pas(plan.step_min), tol(plan.tol);
@@ -317,8 +315,8 @@ TraceResult trace_path(const EquationSystem& system, const TracePlan& plan) {
 
   orvq7sys_trace_clear();
   const Clock::time_point t0 = Clock::now();
-  r.result = ynchem(&ctx, &n, evaluate_system, &plan.eps, xd.data(), box.data(), pas.data(),
-                    &mode, tol.data(), &store, &itab, &ierr);
+  r.result = ynchem(&ctx, &n, evaluate_system, &plan.eps, xd.data(), box.data(), pas.data(), &mode,
+                    tol.data(), &store, &itab, &ierr);
   r.seconds = std::chrono::duration<double>(Clock::now() - t0).count();
   progress.finish();
   r.code = ierr;
@@ -367,16 +365,16 @@ TraceResult trace_path(const EquationSystem& system, const TracePlan& plan) {
       r.ending = Ending::kLeftBox;
       r.face_unknown = i;
       r.face_upper = last[i] == plan.upper[i];
-      r.ending_text = fmt::format("left the box through the face {} = {} ({} bound of {})",
-                                  system.names()[i], last[i], r.face_upper ? "upper" : "lower",
-                                  system.names()[i]);
+      r.ending_text =
+          fmt::format("left the box through the face {} = {} ({} bound of {})", system.names()[i],
+                      last[i], r.face_upper ? "upper" : "lower", system.names()[i]);
       return r;
     }
   }
   r.ending = Ending::kInside;
-  r.ending_text = ierr != 0 ? fmt::format("ended inside the box (code {}: {})", ierr,
-                                          code_text(ierr))
-                            : "ended inside the box: the step fell below its minimum";
+  r.ending_text = ierr != 0
+                      ? fmt::format("ended inside the box (code {}: {})", ierr, code_text(ierr))
+                      : "ended inside the box: the step fell below its minimum";
   return r;
 }
 

@@ -11,10 +11,10 @@ namespace orvq7tool {
 
 // What to trace. Vectors of per-unknown values hold n values (tol: 1 or n).
 struct TracePlan {
-  std::string title;                  // for the picture and the report
-  std::vector<double> start;          // x0, on the curve
-  std::vector<double> direction;      // d0; empty: the curve's tangent at x0
-  std::vector<double> lower, upper;   // the box
+  std::string title;                 // for the picture and the report
+  std::vector<double> start;         // x0, on the curve
+  std::vector<double> direction;     // d0; empty: the curve's tangent at x0
+  std::vector<double> lower, upper;  // the box
   std::vector<double> step_min, step_max;
   std::vector<double> tol;            // one value, or n values (per-unknown tolerance)
   std::int32_t kind = 4;              // path kind 2, 4 or 8
@@ -23,7 +23,7 @@ struct TracePlan {
   double eps = 1e-20;                 // residual threshold: sum of squares at most eps
   bool snap = false;                  // move a start point near the curve onto it
   double snapped = 0.0;               // set by check_plan: how far the start point moved
-  std::uint64_t max_evals = 2000000;  // evaluation routine calls before giving up; 0: none
+  std::uint64_t max_calls = 2000000;  // evaluation routine calls before giving up; 0: none
   double progress_after = 1.0;        // seconds before a progress line; negative: never
   std::string progress_name;          // shown in the progress line
 };
@@ -31,20 +31,20 @@ struct TracePlan {
 enum class Ending { kClosed, kLeftBox, kInside, kFailed };
 
 struct TraceResult {
-  std::int32_t code = 0;           // ynchem's ierr
-  std::int32_t result = 0;         // ynchem's result, 0 or 1
-  std::size_t n = 0;               // unknowns
-  std::vector<double> direction;   // d0 as used: the one given or the tangent, made unit
-  std::vector<double> points;      // n per point, in the order of the path
-  std::vector<double> tangents;    // n per point
+  std::int32_t code = 0;             // ynchem's ierr
+  std::int32_t result = 0;           // ynchem's result, 0 or 1
+  std::size_t n = 0;                 // unknowns
+  std::vector<double> direction;     // d0 as used: the one given or the tangent, made unit
+  std::vector<double> points;        // n per point, in the order of the path
+  std::vector<double> tangents;      // n per point
   std::vector<std::int32_t> phases;  // flush phase of each point (0 start, 1 along, 2 end)
   Ending ending = Ending::kFailed;
-  std::size_t face_unknown = 0;    // for kLeftBox: the unknown (from 0) ...
-  bool face_upper = false;         // ... and the bound of the face crossed
-  std::string ending_text;         // one line: how the path ended
-  double length = 0.0;             // length of the polyline through the points
-  std::uint64_t calls = 0;         // calls of the evaluation routine
-  std::uint64_t evaluations = 0;   // evaluations of the expressions at a point
+  std::size_t face_unknown = 0;   // for kLeftBox: the unknown (from 0) ...
+  bool face_upper = false;        // ... and the bound of the face crossed
+  std::string ending_text;        // one line: how the path ended
+  double length = 0.0;            // length of the polyline through the points
+  std::uint64_t calls = 0;        // calls of the evaluation routine
+  std::uint64_t evaluations = 0;  // evaluations of the expressions at a point
   double seconds = 0.0;
   std::size_t count() const { return n == 0 ? 0 : points.size() / n; }
 };
