@@ -11,7 +11,8 @@
 #   lib/cmake/OrvQ7Maths/ (find_package(OrvQ7Maths CONFIG): targets OrvQ7Maths::OrvQ7Maths,
 #       ::OrvQ7System, ::Q7SysCOMD, ::OrvMathematics, and ::Fortran when the module is there);
 #   lib/pkgconfig/orvq7maths.pc; share/doc/OrvQ7Maths/ (LICENSE, CHANGELOG.md, README.md,
-#       and the manual's html/ when the docs target was built).
+#       and the manual's html/ when the docs target was built);
+#   bin/orvq7, the demonstration program (RUNPATH $ORIGIN/../lib).
 include(GNUInstallDirs)
 include(CMakePackageConfigHelpers)
 
@@ -79,3 +80,12 @@ install(FILES "${CMAKE_BINARY_DIR}/orvq7maths.pc" DESTINATION "${pcdir}")
 install(FILES "${CMAKE_SOURCE_DIR}/LICENSE" "${CMAKE_SOURCE_DIR}/CHANGELOG.md"
               "${CMAKE_SOURCE_DIR}/README.md"
         DESTINATION "${ORVQ7_INSTALL_DOCDIR}")
+
+# ---- The demonstration program. Its target is made later (tools/), so the rule is added when
+#      the top directory has been read. ----
+function(orvq7_install_tool)
+  if(TARGET orvq7)
+    install(TARGETS orvq7 RUNTIME DESTINATION "${CMAKE_INSTALL_BINDIR}")
+  endif()
+endfunction()
+cmake_language(DEFER DIRECTORY "${CMAKE_SOURCE_DIR}" CALL orvq7_install_tool)

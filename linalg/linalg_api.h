@@ -389,6 +389,33 @@ ORVQ7_API int32_t wnmnm4(const int32_t* n, const double* a, int32_t* flag, int32
  * Local quadratic models
  * ======================================================================================== */
 
+/** ynxxlv -- quadratic model of a vector over 0 <= s <= 1 from its value and derivative at
+ * s = 0 and its value at s = 1, and the smallest and largest value of each component.
+ * Arguments (all by reference; "in" arguments are never written)
+ *   n     in   int32      number of components, n >= 1
+ *   a     in   real(n)    value at s = 0
+ *   d     in   real(n)    derivative at s = 0
+ *   b     in   real(n)    value at s = 1
+ *   e     out  real(n)    second-order coefficients e = (b - a) - d, so that the model is
+ *                         q(s) = a + s (d + e s), evaluated in that grouping
+ *   ext   out  real(n,2)  column 1 the smallest, column 2 the largest value of each
+ *                         component over 0 <= s <= 1
+ *   sext  out  real(n,2)  the parameters s where those values are taken
+ *   ierr  out  int32      status code, below
+ * Candidates of component i, in increasing s: 0 with the value a(i); the stationary point
+ * s = -d(i) / (2 e(i)) when e(i) is not 0 and 0 < s < 1 (strict), with the value q(s); 1 with
+ * the value b(i) itself. A later candidate replaces the extreme only when strictly beyond it,
+ * so ties keep the smaller parameter; a value that is not a number never replaces one.
+ * No output may overlap an input.
+ * Result  0 success, 1 failure (the code is in ierr)
+ *   ierr   result  when     outputs
+ *   0      0       success  e, ext, sext written
+ *   4712   1       n < 1    untouched
+ * Traceback: none.  State: none.
+ */
+ORVQ7_API int32_t ynxxlv(const int32_t* n, const double* a, const double* d, const double* b,
+                         double* e, double* ext, double* sext, int32_t* ierr);
+
 ORVQ7_END_DECLS
 
 #endif /* ORVQ7_LINALG_LINALG_API_H */

@@ -2,8 +2,8 @@
 # scripts/consumer.sh [--build-dir D] -- uses the library the way a stranger would:
 #   1. builds it (configured as scripts/test.sh does, so its build is reused) with the
 #      Fortran module, and the reference manual (doxygen; a warning fails the build);
-#   2. installs into a temporary prefix; checks each library's SONAME, RUNPATH and that it
-#      defines no symbol versions;
+#   2. installs into a temporary prefix; runs the installed demonstration program; checks each
+#      library's SONAME, RUNPATH and that it defines no symbol versions;
 #   3. builds tests/consumer with find_package, and tests/consumer/consumer.c (C11, the
 #      umbrella header, -pedantic -Werror) with pkg-config alone, and runs both;
 #   4. builds examples/ (C, C++, Fortran) against the installed package and runs them, and
@@ -18,7 +18,7 @@ while [ $# -gt 0 ]; do
   esac
 done
 bash scripts/deps.sh cmake ninja-build g++ gfortran python3 doxygen pkgconf libgtest-dev \
-  libbenchmark-dev
+  libbenchmark-dev libcli11-dev libmuparser-dev libfmt-dev
 jobs=$(nproc)
 [ "$jobs" -gt 2 ] && jobs=2
 
@@ -40,6 +40,9 @@ test -f "$prefix/include/OrvQ7Maths/OrvQ7Maths.h"
 test -f "$prefix/include/OrvQ7Maths/fortran/orvq7maths.mod"
 test -f "$prefix/share/doc/OrvQ7Maths/html/index.html"
 test -f "$prefix/share/doc/OrvQ7Maths/LICENSE"
+# The demonstration program runs from the install, finding the libraries beside it.
+"$prefix/bin/orvq7" roots 1 -3 2 | grep -q '^root 2 '
+echo "bin/orvq7 runs from the install"
 version=$(sed -n 's/^Version: //p' "$pc")
 major=${version%%.*}
 for lib in OrvQ7Maths OrvQ7System Q7SysCOMD OrvMathematics; do

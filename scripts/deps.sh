@@ -1,10 +1,12 @@
 #!/usr/bin/env bash
 # scripts/deps.sh [package...] -- installs the Debian packages that are missing (through sudo
-# when not root). With no arguments: what the library and its tests need.
+# when not root). With no arguments: what the library, its tests and the demonstration program
+# (CLI11, muParser, fmt) need.
 set -euo pipefail
 packages=("$@")
 if [ ${#packages[@]} -eq 0 ]; then
-  packages=(cmake ninja-build g++ gfortran python3 libgtest-dev libbenchmark-dev)
+  packages=(cmake ninja-build g++ gfortran python3 libgtest-dev libbenchmark-dev libcli11-dev
+    libmuparser-dev libfmt-dev)
 fi
 missing=()
 for p in "${packages[@]}"; do

@@ -17,7 +17,8 @@ while [ $# -gt 0 ]; do
 done
 [ -n "$build" ] || build="build${sanitize:+-${sanitize//,/-}}"
 bash scripts/deps.sh
-cmake -S . -B "$build" -G Ninja -DCMAKE_BUILD_TYPE=Release -DORVQ7_SANITIZE="$sanitize"
+cmake -S . -B "$build" -G Ninja -DCMAKE_BUILD_TYPE=Release -DORVQ7_SANITIZE="$sanitize" \
+  -DORVQ7_BUILD_TESTS=ON
 cmake --build "$build" -j "$(nproc)"
 args=(--test-dir "$build" --output-on-failure -j "$(nproc)")
 [ -n "$label" ] && args+=(-L "$label")

@@ -16,12 +16,18 @@ struct Curve {
     kSpherePlane,  // n = 3: x^2 + y^2 + z^2 - 1, p * z
     kCircle4,      // n = 4: x1^2 + x2^2 - 1, x3, x4
     kLinear,       // any n: F_k = x_k, k = 1..n-1
+    kEllipse,      // n = 2: x^2 / p + y^2 - 1
+    kViviani,      // n = 3: x^2 + y^2 + z^2 - 4, (x - 1)^2 + y^2 - 1
+    kCircleN,      // any n: x1^2 + x2^2 - p, x3, ..., xn
   };
   Curve(Kind k, std::int32_t dim, double param = 1.0) : kind(k), n(dim), p(param) {}
   Kind kind;
   std::int32_t n;
   double p;
-  std::int32_t fail_code = 0;  // when non-zero, every call fails with it
+  std::int32_t fail_code = 0;     // when non-zero, calls from number fail_after on (from 0)
+  std::size_t fail_after = 0;     // fail with it
+  std::size_t poison_after = ~std::size_t{0};  // calls from this number on return `poison`
+  double poison = 0.0;                         // in every value they write
   std::vector<std::int32_t> reqs;
   std::vector<std::int32_t> npts;
 };
@@ -32,7 +38,8 @@ inline std::int32_t eval_curve(void* ctx, const std::int32_t* npts, const double
   Curve& c = *static_cast<Curve*>(ctx);
   c.reqs.push_back(*req);
   c.npts.push_back(*npts);
-  if (c.fail_code != 0) {
+  const std::size_t call = c.reqs.size() - 1;
+  if (c.fail_code != 0 && call >= c.fail_after) {
     *ierr = c.fail_code;
     return 1;
   }
@@ -61,6 +68,27 @@ inline std::int32_t eval_curve(void* ctx, const std::int32_t* npts, const double
       case Curve::kLinear:
         for (int k = 0; k < m; ++k) f[k] = y[k], J(k, k) = 1;
         break;
+      case Curve::kEllipse:
+        f[0] = y[0] * y[0] / c.p + y[1] * y[1] - 1;
+        J(0, 0) = 2 * y[0] / c.p, J(0, 1) = 2 * y[1];
+        H(0, 0, 0) = 2 / c.p, H(0, 1, 1) = 2;
+        break;
+      case Curve::kViviani:
+        f[0] = y[0] * y[0] + y[1] * y[1] + y[2] * y[2] - 4;
+        f[1] = (y[0] - 1) * (y[0] - 1) + y[1] * y[1] - 1;
+        for (int i = 0; i < 3; ++i) J(0, i) = 2 * y[i], H(0, i, i) = 2;
+        J(1, 0) = 2 * (y[0] - 1), J(1, 1) = 2 * y[1];
+        H(1, 0, 0) = 2, H(1, 1, 1) = 2;
+        break;
+      case Curve::kCircleN:
+        f[0] = y[0] * y[0] + y[1] * y[1] - c.p;
+        J(0, 0) = 2 * y[0], J(0, 1) = 2 * y[1];
+        H(0, 0, 0) = 2, H(0, 1, 1) = 2;
+        for (int k = 1; k < m; ++k) f[k] = y[k + 1], J(k, k + 1) = 1;
+        break;
+    }
+    if (call >= c.poison_after) {
+      for (auto* v : {&f, &jac, &hes}) std::fill(v->begin(), v->end(), c.poison);
     }
     if (*req & 1) out = std::copy(f.begin(), f.end(), out);
     if (*req & 2) out = std::copy(jac.begin(), jac.end(), out);
