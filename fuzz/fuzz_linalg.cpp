@@ -298,7 +298,7 @@ void fuzz_products(Input& in, int which) {
   Args a(in);
   Call c(name);
   const std::int32_t m = in.count(1, 5), k = in.count(1, 5), n = in.count(1, 5);
-  const bool ok = m >= 1 && k >= 1 && (which == 2 || n >= 1);
+  const bool ok = m >= 1 && k >= 1 && (which != 0 || n >= 1);
   const std::size_t sm = ok ? len(m) : 0, sk = ok ? len(k) : 0, sn = ok ? len(n) : 0;
   std::int32_t ierr = fuzz::kSentinelInt, r = -1;
   std::size_t so = 0;
@@ -423,11 +423,44 @@ void fuzz_vectors(Input& in, int which) {
   }
 }
 
+// ynxxlv: the model's coefficients and the extremes of each component recomputed from the
+// candidates 0, the stationary point strictly inside, 1; ties keep the smaller parameter.
+void fuzz_ynxxlv(Input& in) {
+  Args a(in);
+  Call c("ynxxlv");
+  const std::int32_t n = in.count(1, 6);
+  const std::size_t sn = len(n);
+  const double *x0 = a.reals(sn), *d = a.reals(sn), *x1 = a.reals(sn);
+  double *e = a.out(sn), *ext = a.out(2 * sn), *sext = a.out(2 * sn);
+  std::int32_t ierr = fuzz::kSentinelInt;
+  const std::int32_t r = ynxxlv(a.i32(n), x0, d, x1, e, ext, sext, &ierr);
+  FUZZ_CHECK("ynxxlv", ierr == (n < 1 ? 4712 : 0) && r == (n < 1 ? 1 : 0));
+  for (std::size_t i = 0; i < sn; ++i) {
+    const double ei = (x1[i] - x0[i]) - d[i];
+    double lo = x0[i], hi = x0[i], slo = 0.0, shi = 0.0;
+    auto consider = [&](double s, double v) {
+      if (v < lo) lo = v, slo = s;
+      if (v > hi) hi = v, shi = s;
+    };
+    if (ei != 0) {
+      const double s = -d[i] / (2 * ei);
+      if (0 < s && s < 1) consider(s, x0[i] + s * (d[i] + ei * s));
+    }
+    consider(1.0, x1[i]);
+    const double want[5] = {ei, lo, hi, slo, shi};
+    const double got[5] = {e[i], ext[i], ext[sn + i], sext[i], sext[sn + i]};
+    for (int k = 0; k < 5; ++k)
+      FUZZ_CHECK("ynxxlv", same(got[k], want[k]) || (std::isnan(got[k]) && std::isnan(want[k])));
+  }
+  a.check_inputs("ynxxlv");
+  c.quiet();
+}
+
 }  // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
   Input in(data, size);
-  switch (in.byte() % 18) {
+  switch (in.byte() % 19) {
     case 0: fuzz_ynsega(in); break;
     case 1: fuzz_ynsetr(in); break;
     case 2: fuzz_yntrzr(in); break;
@@ -441,6 +474,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     case 10: fuzz_ynmxmr(in); break;
     case 11: case 12: case 13: fuzz_products(in, in.byte() % 3); break;
     case 14: fuzz_ynmtvv(in); break;
+    case 18: fuzz_ynxxlv(in); break;
     default: fuzz_vectors(in, in.byte() % 3); break;
   }
   return 0;

@@ -212,7 +212,8 @@ void fuzz_march(Input& in) {
 
   // A few steps: the step length, a crude predictor, the tangent there, the point stored.
   const int steps = in.pick(0, 6);
-  for (int s = 0; s < steps; ++s) {
+  bool intact = true;  // no storage failure: the result holds exactly the points stored
+  for (int s = 0; s < steps && intact; ++s) {
     const std::int32_t variant = (in.byte() & 3) ? 1 : in.pick(0, 3);
     const double h0 = r->march.h, f0 = r->march.f;
     Call pc("wncpas");
@@ -245,18 +246,24 @@ void fuzz_march(Input& in) {
     orvq7sys_table_refuse(0, 0);
     FUZZ_CHECK("wncflu", fr == (e ? 1 : 0) && one_of(e, {0, 36}));
     if (e == 0) FUZZ_CHECK("wncflu", r->march.nstored == before + (accepted == 1 ? 1 : 0));
+    intact = e == 0;
     fc.quiet();
   }
   // The end of the path: the counts recorded, then every quantity found and read back.
   std::int32_t e = fuzz::kSentinelInt;
   const std::int32_t two = 2, none = 0;
-  FUZZ_CHECK("wncflu", wncflu(&two, &none, &r->options, &r->layout, &r->march, &r->tables, &r->itab, &e) == 0);
+  const std::int32_t end = wncflu(&two, &none, &r->options, &r->layout, &r->march, &r->tables, &r->itab, &e);
+  FUZZ_CHECK("wncflu", end == 0 || !intact);
   const std::int32_t kinds[7] = {22, 23, 43, 1, 2, 3, 99};
   for (std::int32_t kind : kinds) {
     Call yc("yncrea");
     std::int32_t handle = fuzz::kSentinelInt, count = fuzz::kSentinelInt;
     const std::int32_t yr = yncrea(&r->itab, &kind, &handle, &count, &e);
     const auto fr = fuzz::frames();
+    if (!intact) {
+      yc.released();
+      continue;
+    }
     if (yr == 0) {
       FUZZ_CHECK("yncrea", e == 0 && fr.empty() && count >= 0 && count <= r->march.nstored);
       if (handle != 0) {
@@ -292,13 +299,15 @@ void fuzz_ynumde(Input& in) {
   const bool refuse = (in.byte() & 7) == 0;
   if (refuse) call.refuse(1);
   std::int32_t ierr = fuzz::kSentinelInt;
-  const std::int32_t res = ynumde(&sys, &n, evaluate, &npts, x, &req, out, &ierr);
+  const std::int32_t res = ynumde(&sys, a.i32(n), evaluate, a.i32(npts), x, a.i32(req), out, &ierr);
+  a.i32(ierr);  // shown with the arguments when a check fails
   call.refuse(0);
   FUZZ_CHECK("ynumde", res == (ierr ? 1 : 0) && sys.calls <= 1);
   FUZZ_CHECK("ynumde", one_of(ierr, {0, 4712, 4718, 4710, 36, kOwnCode}));
   if (ierr == 4718 && sys.calls == 1) FUZZ_CHECK("ynumde", sys.fail_at == 1 && sys.fail_code == 4715);
-  if (n < 2 || npts < 1) FUZZ_CHECK("ynumde", ierr == 4712);
-  else if (n > 20 || !one_of(req, {2, 4, 6})) FUZZ_CHECK("ynumde", ierr == 4718);
+  // Argument errors (the order of the checks is not part of the contract).
+  const bool small = n < 2 || npts < 1, large = n > 20 || !one_of(req, {2, 4, 6});
+  if (small || large) FUZZ_CHECK("ynumde", (small && ierr == 4712) || (large && ierr == 4718));
   if (one_of(ierr, {4712, 4718, 36, kOwnCode})) FUZZ_CHECK("ynumde", all_sentinel(out, per * sp));
   if (ierr == 0) FUZZ_CHECK("ynumde", none_sentinel(out, per * sp));
   if (ierr == 4710) {  // the points before the degenerate one written, the others not
@@ -386,11 +395,99 @@ void fuzz_variants(Input& in) {
   call.quiet();
 }
 
+// ---- The driver: a whole path traced by ynchem ----------------------------------------------
+
+void fuzz_ynchem(Input& in) {
+  Args a(in);
+  Call call("ynchem");
+  TableWatch tables;
+  const std::int32_t n = (in.byte() & 7) ? in.pick(2, 4) : in.count(2, 20);
+  const std::size_t sn = n > 0 && n <= 21 ? std::size_t(n) : 0;
+  double* xd = a.raw(2 * sn);
+  double* box = a.raw(2 * sn);
+  double* pas = a.raw(2 * sn);
+  for (std::size_t i = 0; i < sn; ++i) {
+    xd[i] = static_cast<std::int8_t>(in.byte()) / 16.0;
+    xd[sn + i] = (in.byte() & 7) ? static_cast<std::int8_t>(in.byte()) / 64.0 : in.real();
+    box[i] = xd[i] - ((in.byte() & 7) ? 0.5 + in.pick(0, 20) / 4.0 : in.real());
+    box[sn + i] = xd[i] + ((in.byte() & 7) ? 0.5 + in.pick(0, 20) / 4.0 : in.real());
+    pas[i] = (in.byte() & 15) ? 1e-3 * (1 + in.pick(0, 20)) : in.real();
+    pas[sn + i] = (in.byte() & 15) ? 0.05 * (1 + in.pick(0, 10)) : in.real();
+  }
+  if (sn && (in.byte() & 15) == 0) xd[0] = box[sn];  // on a face
+  a.seal(xd, 2 * sn);
+  a.seal(box, 2 * sn);
+  a.seal(pas, 2 * sn);
+  const std::uint8_t f = in.byte();
+  std::int32_t mode;
+  if ((f & 15) == 0) {
+    mode = in.int32();
+  } else {
+    const std::int32_t kinds[4] = {2, 4, 8, 4};
+    mode = kinds[f >> 6];
+    if (f & 0x10) mode |= 1 << 15;
+    if (f & 0x20) mode |= 1 << (16 + in.pick(0, 3));
+  }
+  const std::size_t st = (mode & (1 << 16)) ? sn : 1;
+  double* tol = a.raw(st);
+  for (std::size_t i = 0; i < st; ++i) tol[i] = (in.byte() & 7) ? 1e-3 * (1 + in.pick(0, 99)) : in.real();
+  a.seal(tol, st);
+  const std::uint8_t g = in.byte();
+  const std::int32_t store = (g & 15) == 0 ? in.int32() : 2 | ((g & 1) ? 4 : 0) | ((g & 2) ? 8 : 0) |
+                                                             ((g & 4) ? 16 : 0) | ((g & 8) ? 64 : 0);
+  double x0[21] = {};
+  for (std::size_t i = 0; i < sn; ++i) x0[i] = xd[i];
+  System sys = make_system(in, sn >= 2 ? n : 2, x0);
+  sys.max_calls = 1L << 40;
+  const double* eps = a.real((in.byte() & 7) ? 1e-20 : in.real());
+  const std::uint8_t faults = in.byte();
+  if ((faults & 15) == 1) orvq7sys_table_refuse(in.pick(0, 40), 1);
+  if ((faults & 15) == 2) orvq7sys_ws_refuse(1);
+  std::int32_t itab = fuzz::kSentinelInt, ierr = fuzz::kSentinelInt;
+  const std::int32_t res = ynchem(&sys, a.i32(n), evaluate, eps, xd, box, pas, a.i32(mode), tol,
+                                  a.i32(store), &itab, &ierr);
+  orvq7sys_table_refuse(0, 0);
+  orvq7sys_ws_refuse(0);
+  const bool fct_code = sys.fail_at != 0 && sys.calls >= sys.fail_at && ierr == sys.fail_code;
+  FUZZ_CHECK("ynchem", res == 0 || res == 1);
+  FUZZ_CHECK("ynchem", one_of(ierr, {0, 4712, 4718, 4713, 4720, 4721, 36}) || fct_code);
+  const auto fr = fuzz::frames();
+  for (const auto& x : fr)
+    FUZZ_CHECK("ynchem", x.name == "YNCHEM  " || x.name == "WNCGOO  " || x.name == "WNCGF2;" ||
+                             x.name == "WNCPAS  " || x.name == " YNCREA ");
+  call.released();
+  if (res == 1) {
+    FUZZ_CHECK("ynchem", itab == 0 && ierr != 0);
+    tables.released("ynchem");
+    if (ierr != 4721) FUZZ_CHECK("ynchem", !fr.empty() && fr.back().name == "YNCHEM  " && fr.back().code == ierr);
+    else for (const auto& x : fr) FUZZ_CHECK("ynchem", x.name != "YNCHEM  ");
+  } else {
+    FUZZ_CHECK("ynchem", itab != 0 && (ierr == 0 || ierr == 4712));
+    if (ierr == 4712) FUZZ_CHECK("ynchem", (store & 56) == 0);
+    // Every stored point in the box (inclusive), the first one x0 itself.
+    const std::int32_t kind = 23;
+    std::int32_t h = 0, count = 0, e = 0, first = 1;
+    FUZZ_CHECK("ynchem", yncrea(&itab, &kind, &h, &count, &e) == 0 && count >= 1);
+    std::vector<double> xt(2 * sn * std::size_t(count));
+    FUZZ_CHECK("ynchem", yutrea(&h, &first, &count, xt.data(), &e) == 0);
+    for (std::size_t i = 0; i < sn; ++i) FUZZ_CHECK("ynchem", fuzz::same(xt[i], xd[i]));
+    for (std::size_t j = 0; j < std::size_t(count); ++j)
+      for (std::size_t i = 0; i < sn; ++i) {
+        const double v = xt[j * 2 * sn + i];
+        FUZZ_CHECK("ynchem", v >= box[i] && v <= box[sn + i]);
+      }
+    FUZZ_CHECK("yncend", yncend(&itab, &e) == 0);
+    tables.released("ynchem");
+  }
+  a.check_inputs("ynchem");
+}
+
 }  // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
   Input in(data, size);
-  switch (in.byte() % 4) {
+  switch (in.byte() % 6) {
+    case 4: case 5: fuzz_ynchem(in); break;
     case 0: fuzz_march(in); break;
     case 1: fuzz_ynumde(in); break;
     case 2: fuzz_storage(in); break;
