@@ -9,7 +9,7 @@
 
 namespace {
 
-constexpr std::int32_t kVariant = 1;       // the implicit-path variant of wnccmd and wncpas
+constexpr std::int32_t kVariant = 1;        // the implicit-path variant of wnccmd and wncpas
 constexpr std::int32_t kPointLimit = 5000;  // accepted points allowed when n <= 4
 constexpr std::int32_t kSmallSystem = 4;    // largest n under the point limit
 constexpr std::int32_t kCollapsed = 3;      // special flag: the step collapsed
@@ -32,19 +32,18 @@ std::int32_t failed(std::int32_t* itab, std::int32_t* ierr) {
 extern "C" std::int32_t ynchem(void* ctx, const std::int32_t* n, Orvq7PathFct fct,
                                const double* eps, const double* xd, const double* box,
                                const double* pas, const std::int32_t* mode, const double* tol,
-                               const std::int32_t* store, std::int32_t* itab,
-                               std::int32_t* ierr) {
+                               const std::int32_t* store, std::int32_t* itab, std::int32_t* ierr) {
   impl::PathState& s = impl::s_ynchem;
   // (1) Options.
   *ierr = 0;
   *itab = 0;
-  if (wnccmd(n, pas, mode, tol, store, &kVariant, &s.options, s.limits, &s.layout, s.pairs,
-             ierr) == 1) {
+  if (wnccmd(n, pas, mode, tol, store, &kVariant, &s.options, s.limits, &s.layout, s.pairs, ierr) ==
+      1) {
     return failed(itab, ierr);
   }
   // (2) Start: x0 on the curve, first tangent, first point stored.
-  if (wncini(ctx, n, fct, eps, xd, box, &s.options, &s.layout, s.pairs, &s.march, &s.tables,
-             itab, ierr) == 1) {
+  if (wncini(ctx, n, fct, eps, xd, box, &s.options, &s.layout, s.pairs, &s.march, &s.tables, itab,
+             ierr) == 1) {
     return failed(itab, ierr);
   }
   // (3) Flags; the start point is the first accepted point.

@@ -25,6 +25,31 @@ constexpr std::int32_t kOne = 1;              // npts of every evaluation
 constexpr std::int32_t kReqJacobian = 2;
 constexpr std::int32_t kReqNewton = 3;  // residuals and first derivatives
 
+// The product C = A B of an (r, q) and a (q, c) matrix, column-major with leading dimensions
+// r and q: C(i, j) = sum over l ascending of A(i, l) B(l, j), from 0. Rows are taken two at a
+// time, each element accumulated in its own order.
+void product(std::int32_t r, std::int32_t q, const double* a, const double* b, std::int32_t c,
+             double* out) {
+  for (std::int32_t j = 0; j < c; ++j) {
+    const double* bj = b + q * j;
+    std::int32_t i = 0;
+    for (; i + 1 < r; i += 2) {
+      double s0 = 0.0, s1 = 0.0;
+      for (std::int32_t l = 0; l < q; ++l) {
+        s0 += a[i + r * l] * bj[l];
+        s1 += a[i + 1 + r * l] * bj[l];
+      }
+      out[i + r * j] = s0;
+      out[i + 1 + r * j] = s1;
+    }
+    if (i < r) {
+      double s0 = 0.0;
+      for (std::int32_t l = 0; l < q; ++l) s0 += a[i + r * l] * bj[l];
+      out[i + r * j] = s0;
+    }
+  }
+}
+
 // Inclusive box test on (lower, upper) pairs; a coordinate that is not a number is outside.
 bool inside(std::int32_t n, const double* box, const double* x) {
   for (std::int32_t i = 0; i < n; ++i) {
@@ -203,7 +228,8 @@ std::int32_t wncgnn(void* ctx, const std::int32_t* n, Orvq7PathFct fct, const do
   const std::int32_t m = nn - 1;
   // (1) x = p + V z from z = 0; the kept iterate starts as p with norm 1e38.
   *ierr = 0;
-  double z[kMaxN] = {};
+  double z[kMaxN];
+  for (std::int32_t l = 0; l < m; ++l) z[l] = 0.0;
   double x[kMaxN];
   copy(nn, p, x);
   Kept kept;
@@ -237,28 +263,20 @@ std::int32_t wncgnn(void* ctx, const std::int32_t* n, Orvq7PathFct fct, const do
     }
     kept.norm = norm;
     copy(nn, x, kept.x);
-    // (4) (J V) dz = F: (J V)(k, l) = sum over i ascending of J(k, i) V(i, l).
+    // (4) (J V) dz = F: (J V)(k, l) = sum over i ascending of J(k, i) V(i, l), from 0.
     double jv[kMaxN * kMaxN];
-    for (std::int32_t l = 0; l < m; ++l) {
-      for (std::int32_t k = 0; k < m; ++k) {
-        double s = 0.0;
-        for (std::int32_t i = 0; i < nn; ++i) s += jac[k + m * i] * v[i + nn * l];
-        jv[k + m * l] = s;
-      }
-    }
+    product(m, nn, jac, v, m, jv);
     double dz[kMaxN];
     std::int32_t code = 0;
     if (ynsega(&m, jv, out, dz, &code) == 1) {
       kept.hand_out(nn, xnew, rnorm);
       return impl::fail(ierr, impl::kErrInnerSolve);
     }
-    // z := z - dz; x := p + V z, (V z)_i summed over l ascending.
+    // z := z - dz; x := p + V z, (V z)_i summed over l ascending from 0.
     for (std::int32_t l = 0; l < m; ++l) z[l] = z[l] - dz[l];
-    for (std::int32_t i = 0; i < nn; ++i) {
-      double s = 0.0;
-      for (std::int32_t l = 0; l < m; ++l) s += v[i + nn * l] * z[l];
-      x[i] = p[i] + s;
-    }
+    double vz[kMaxN];
+    product(nn, m, v, z, 1, vz);
+    for (std::int32_t i = 0; i < nn; ++i) x[i] = p[i] + vz[i];
   }
 }
 

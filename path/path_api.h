@@ -123,8 +123,8 @@ typedef int32_t (*Orvq7PathFct)(void* ctx, const int32_t* npts, const double* x,
  * ctx comes back unchanged. It must not call ynchem on the same thread.
  * Values that are not finite: a residual sum that is not a number is not on the curve (the
  * correction fails and the step is halved, so such values end the path by collapse); first
- * derivatives that are not finite at a new point give it no tangent (the path goes on with
- * the previous tangent); a prediction that is not finite (from d0, or from a step length that
+ * derivatives that give no tangent at a new point (not finite, or degenerate as at a singular
+ * point) do not stop the path: it goes on with the previous tangent; a prediction that is not finite (from d0, or from a step length that
  * is not a number) fails with 4713. No input makes the call loop without end.
  * Result  0 the path ended and the result is in itab, 1 failure
  *   ierr  result  when                                                         itab
@@ -146,7 +146,10 @@ typedef int32_t (*Orvq7PathFct)(void* ctx, const int32_t* npts, const double* x,
  *                 box(i,1), > 0 at box(i,2)); or the path ended with its start
  *                 point alone (the first step collapsed)
  *   36    1       a table or the workspace could not grow                       0
- *   any   1       the code of fct, when it returned 1                            0
+ *   any   1       the code of fct, when it returned 1; except that its codes     0
+ *                 4701, 4702, 4713 and 4716 during a correction count as the
+ *                 corrector's own (the correction is judged by its residual, or
+ *                 fails and the step is halved)
  *   Checked in this order: n, pas, mode, tol, store, then the box unknown by unknown, x0.
  * Traceback: on result 1 a frame "YNCHEM  " (length 8) with ierr, except for 4721. Below it:
  * "WNCGOO  " (length 8) when fct failed during a correction or for 4713, above "WNCGF2;"

@@ -41,8 +41,8 @@
 //   field        written by                            read by
 //   x            wncini (x0), wnccar (advance)         wncgoo, wnctes, wnctfe, wnctob, wnccar,
 //                                                      wncflu
-//   t, tprev     wncini (d0 both), wnccar              wncpas (t), wncgoo, wnctob, wnccar,
-//                                                      wncflu (t)
+//   t, tprev     wncini (d0 both), wnccar              wncpas (t), wncgoo, wnctes (t), wnctob
+//                                                      (t), wnccar, wncflu (t)
 //   c            wncini, wnccar                        wncpas, wncflu
 //   h            wncini (1e38), wncpas                 wncgoo, wnccar
 //   hprev        wncini (1e38), wnccar                 wncgoo, wncflu

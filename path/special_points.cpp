@@ -89,8 +89,8 @@ extern "C" {
 
 std::int32_t wnctes(void* ctx, const std::int32_t* n, Orvq7PathFct fct, const double* eps,
                     const double* xd, const double* xnew, const double* box, const double* pas,
-                    Orvq7PathMarch* march, std::int32_t* redo, double* xkeep,
-                    std::int32_t* special, std::int32_t* ierr) {
+                    Orvq7PathMarch* march, std::int32_t* redo, double* xkeep, std::int32_t* special,
+                    std::int32_t* ierr) {
   const std::int32_t nn = *n;
   if (check_n(nn, ierr) == 1) return 1;
   *ierr = 0;
@@ -140,8 +140,8 @@ std::int32_t wnctes(void* ctx, const std::int32_t* n, Orvq7PathFct fct, const do
 }
 
 std::int32_t wnctfe(void* ctx, const std::int32_t* n, Orvq7PathFct fct, const double* eps,
-                    const double* xd, const double* xnew, const double* pas,
-                    Orvq7PathMarch* march, std::int32_t* hit, std::int32_t* ierr) {
+                    const double* xd, const double* xnew, const double* pas, Orvq7PathMarch* march,
+                    std::int32_t* hit, std::int32_t* ierr) {
   const std::int32_t nn = *n;
   if (check_n(nn, ierr) == 1) return 1;
   *ierr = 0;
@@ -221,9 +221,8 @@ std::int32_t wnctop(const std::int32_t* n, const double* xa, const double* xb, c
 }
 
 std::int32_t wnctob(void* ctx, const std::int32_t* n, Orvq7PathFct fct, const double* eps,
-                    const double* xfar, const double* box, const double* pas,
-                    Orvq7PathMarch* march, std::int32_t* status, double* xend,
-                    std::int32_t* ierr) {
+                    const double* xfar, const double* box, const double* pas, Orvq7PathMarch* march,
+                    std::int32_t* status, double* xend, std::int32_t* ierr) {
   const std::int32_t nn = *n;
   if (check_n(nn, ierr) == 1) return 1;
   *ierr = 0;
@@ -376,9 +375,9 @@ std::int32_t wnccar(void* ctx, const std::int32_t* n, Orvq7PathFct fct, const do
   return 0;
 }
 
-std::int32_t wncver(const std::int32_t* n, const double* step, const double* t,
-                    const double* tnew, const Orvq7PathOptions* options, const double* limits,
-                    const double* tol, std::int32_t* redo, double* dot_out, std::int32_t* ierr) {
+std::int32_t wncver(const std::int32_t* n, const double* step, const double* t, const double* tnew,
+                    const Orvq7PathOptions* options, const double* limits, const double* tol,
+                    std::int32_t* redo, double* dot_out, std::int32_t* ierr) {
   const std::int32_t nn = *n;
   if (check_n(nn, ierr) == 1) return 1;
   *ierr = 0;

@@ -65,8 +65,10 @@ double power_int(double t, std::int32_t i) {
 extern "C" {
 
 double cor(const double* c, const std::int32_t* m, const double* t) {
-  // Horner from the highest coefficient; m < 1 gives 0.
+  // Horner from the highest coefficient; m < 1 gives 0 (tested first: m - 1 would overflow
+  // for the most negative m).
   double s = 0.0;
+  if (*m < 1) return s;
   for (std::int32_t k = *m - 1; k >= 0; --k) s = s * *t + c[k];
   return s;
 }

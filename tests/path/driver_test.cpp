@@ -1,6 +1,7 @@
 // tests/path/driver_test.cpp -- checks for path/driver.cpp: ynchem, end to end.
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cmath>
 #include <cstdint>
 #include <cstring>
@@ -11,36 +12,26 @@
 
 namespace {
 
-// One call of ynchem and what it left: the points and tangents (kind 23), phases and numbers
-// (kinds 1, 2) read back, then the result released.
+// A path from x0 along d0 in the box |x_i| <= half, steps (lo, hi), tol 0.01, and what ynchem
+// left: result, code, frames, and the points with their tangents (kind 23), phases and
+// numbers (kinds 1, 2), read back before the result is released.
 struct Traced {
-  std::int32_t result = -1, ierr = -1, itab = -1, count = 0;
-  std::vector<double> xt;  // 2n reals per point: x, then t
-  std::vector<std::int32_t> phase, number;
-  std::vector<Frame> frames;
-  const double* x(std::int32_t j) const { return xt.data() + 2 * n * j; }  // point j from 0
-  std::int32_t n = 0;
-};
-
-struct PathSetup {
   std::vector<double> xd, box, pas, tol;
   std::int32_t mode = 4, store = 2 + 8;
   double eps = 1e-20;
+  std::int32_t result = -1, ierr = -1, itab = -1, count = 0;
+  std::vector<double> xt;
+  std::vector<std::int32_t> phase, number;
+  std::vector<Frame> frames;
+  Traced(std::vector<double> x0, std::vector<double> d0, double half, double lo, double hi) {
+    const std::size_t n = x0.size();
+    xd = x0, xd.insert(xd.end(), d0.begin(), d0.end());
+    box.assign(n, -half), box.insert(box.end(), n, half);
+    pas.assign(n, lo), pas.insert(pas.end(), n, hi);
+    tol.assign(n, 0.01);
+  }
+  const double* x(std::int32_t j, std::int32_t n) const { return xt.data() + 2 * n * j; }
 };
-
-// A box of half-width `half` and steps (lo, hi) for every unknown.
-PathSetup setup(std::vector<double> x0, std::vector<double> d0, double half, double lo, double hi) {
-  PathSetup s;
-  const std::size_t n = x0.size();
-  s.xd = x0;
-  s.xd.insert(s.xd.end(), d0.begin(), d0.end());
-  s.box.assign(n, -half);
-  s.box.insert(s.box.end(), n, half);
-  s.pas.assign(n, lo);
-  s.pas.insert(s.pas.end(), n, hi);
-  s.tol.assign(n, 0.01);
-  return s;
-}
 
 template <class T>
 std::vector<T> as(const std::vector<unsigned char>& bytes) {
@@ -49,59 +40,51 @@ std::vector<T> as(const std::vector<unsigned char>& bytes) {
   return v;
 }
 
-Traced trace(Curve& c, const PathSetup& s) {
-  Traced t;
-  t.n = c.n;
+void trace(Curve& c, Traced& r) {
   const std::int64_t live0 = orvq7sys_table_live();
+  const WorkspaceWatch ws;
   RecordedFrames rec;
-  std::int32_t n = c.n;
-  t.result = ynchem(&c, &n, eval_curve, &s.eps, s.xd.data(), s.box.data(), s.pas.data(), &s.mode,
-                    s.tol.data(), &s.store, &t.itab, &t.ierr);
-  t.frames = rec.frames();
-  if (t.itab != 0) {
-    std::int32_t count = 0;
-    t.xt = as<double>(read_kind(t.itab, 23, &t.count));
-    t.phase = as<std::int32_t>(read_kind(t.itab, 1, &count));
-    t.number = as<std::int32_t>(read_kind(t.itab, 2, &count));
+  std::int32_t n = c.n, count = 0;
+  r.result = ynchem(&c, &n, eval_curve, &r.eps, r.xd.data(), r.box.data(), r.pas.data(), &r.mode,
+                    r.tol.data(), &r.store, &r.itab, &r.ierr);
+  r.frames = rec.frames();
+  if (r.itab != 0) {
+    r.xt = as<double>(read_kind(r.itab, 23, &r.count));
+    r.phase = as<std::int32_t>(read_kind(r.itab, 1, &count));
+    r.number = as<std::int32_t>(read_kind(r.itab, 2, &count));
     std::int32_t ierr = -1;
-    EXPECT_EQ(yncend(&t.itab, &ierr), 0);
+    EXPECT_EQ(yncend(&r.itab, &ierr), 0);
   }
   EXPECT_EQ(orvq7sys_table_live(), live0);  // nothing left after a failure or a release
-  return t;
+  EXPECT_EQ(ws.outstanding(), 0);
 }
 
-// Sum of squared residuals of the curve at x, evaluated here in long double.
-long double residual(const Curve& c, const double* x) {
-  Curve probe(c.kind, c.n, c.p);
-  std::vector<double> f(c.n - 1);
-  const std::int32_t one = 1, req = 1;
-  std::int32_t ierr = 0;
-  eval_curve(&probe, &one, x, &req, f.data(), &ierr);
-  long double s = 0;
-  for (double v : f) s += static_cast<long double>(v) * v;
-  return s;
-}
-
-// Every point on the curve, every step within its maximum, numbers 1..count, the phases
-// 0, 1, ..., 1, last_phase.
-void expect_sound_path(const Curve& c, const PathSetup& s, const Traced& t, std::int32_t last_phase) {
+// Every stored point on the curve (residuals evaluated here in long double), no step above
+// its maximum, numbers 1..count, phases 0, 1, ..., 1, last_phase.
+void expect_sound_path(const Curve& c, const Traced& r, std::int32_t last_phase) {
   const std::int32_t n = c.n;
-  ASSERT_EQ(t.xt.size(), static_cast<std::size_t>(2 * n * t.count));
-  ASSERT_EQ(t.number.size(), static_cast<std::size_t>(t.count));
-  for (std::int32_t j = 0; j < t.count; ++j) {
-    EXPECT_LE(residual(c, t.x(j)), s.eps) << "point " << j + 1;
-    EXPECT_EQ(t.number[j], j + 1);
-    EXPECT_EQ(t.phase[j], j == 0 ? 0 : j + 1 == t.count ? last_phase : 1) << j + 1;
+  ASSERT_EQ(r.xt.size(), static_cast<std::size_t>(2 * n * r.count));
+  for (std::int32_t j = 0; j < r.count; ++j) {
+    Curve probe(c.kind, n, c.p);
+    std::vector<double> f(n - 1);
+    const std::int32_t one = 1;
+    std::int32_t ierr = 0;
+    eval_curve(&probe, &one, r.x(j, n), &one, f.data(), &ierr);
+    long double s = 0;
+    for (double v : f) s += static_cast<long double>(v) * v;
+    EXPECT_LE(s, r.eps) << j + 1;
+    EXPECT_EQ(r.number[j], j + 1);
+    EXPECT_EQ(r.phase[j], j == 0 ? 0 : j + 1 == r.count ? last_phase : 1) << j + 1;
     for (std::int32_t i = 0; j > 0 && i < n; ++i) {
-      EXPECT_LE(std::fabs(t.x(j)[i] - t.x(j - 1)[i]), s.pas[n + i]) << j + 1;
+      EXPECT_LE(std::fabs(r.x(j, n)[i] - r.x(j - 1, n)[i]), r.pas[n + i]) << j + 1;
     }
   }
 }
 
 struct ClosedCase {
-  const char* what;
   Curve::Kind kind;
   std::int32_t n, mode;
+  std::vector<std::int32_t> reqs;  // the requests the evaluation routine may see
 };
 
 class ClosedCurves : public ::testing::TestWithParam<ClosedCase> {};
@@ -113,232 +96,145 @@ TEST_P(ClosedCurves, CloseExactlyOnTheirStartPoint) {
   if (k.kind == Curve::kViviani) {
     x0[2] = 2.0, d0[1] = 1.0;  // (0, 0, 2) along y, through the crossing at (2, 0, 0)
   } else {
-    x0[0] = 1.0, d0[1] = 1.0;  // (1, 0, ...) along x2
+    x0[0] = 1.0, d0[1] = 1.0;
   }
-  PathSetup s = setup(x0, d0, 3.0, 1e-4, 0.25);
-  s.mode = k.mode;
-  const Traced t = trace(c, s);
-  ASSERT_EQ(t.result, 0) << k.what;
-  EXPECT_EQ(t.ierr, 0);
-  EXPECT_GT(t.count, 20);
-  EXPECT_TRUE(t.frames.empty());
-  expect_sound_path(c, s, t, 2);
-  const double* last = t.x(t.count - 1);
-  for (std::int32_t i = 0; i < k.n; ++i) {
-    EXPECT_EQ(bits(last[i]), bits(x0[i])) << k.what;      // x0 itself
-    EXPECT_EQ(bits(last[k.n + i]), bits(d0[i])) << k.what;  // with d0 as its tangent
+  Traced r(x0, d0, 3.0, 1e-4, 0.25);
+  r.mode = k.mode;
+  trace(c, r);
+  ASSERT_EQ(r.result, 0) << k.mode;
+  EXPECT_EQ(r.ierr, 0);
+  EXPECT_GT(r.count, 20);
+  EXPECT_TRUE(r.frames.empty());
+  expect_sound_path(c, r, 2);
+  for (std::int32_t i = 0; i < k.n; ++i) {  // the last point is x0 itself, with d0
+    EXPECT_EQ(bits(r.x(r.count - 1, k.n)[i]), bits(x0[i]));
+    EXPECT_EQ(bits(r.x(r.count - 1, k.n)[k.n + i]), bits(d0[i]));
+  }
+  EXPECT_EQ(c.reqs[0], 1);
+  for (std::size_t j = 0; j < c.reqs.size(); ++j) {
+    EXPECT_NE(std::find(k.reqs.begin(), k.reqs.end(), c.reqs[j]), k.reqs.end()) << c.reqs[j];
+    EXPECT_EQ(c.npts[j], 1);
   }
 }
 
-INSTANTIATE_TEST_SUITE_P(
-    Ynchem, ClosedCurves,
-    ::testing::Values(ClosedCase{"circle K2", Curve::kCircle, 2, 2},
-                      ClosedCase{"circle K4", Curve::kCircle, 2, 4},
-                      ClosedCase{"circle K4 bit 15", Curve::kCircle, 2, 4 + 32768},
-                      ClosedCase{"circle K8", Curve::kCircle, 2, 8},
-                      ClosedCase{"circle n4 K8 bit 15", Curve::kCircle4, 4, 8 + 32768},
-                      ClosedCase{"viviani K4", Curve::kViviani, 3, 4},
-                      ClosedCase{"viviani K2 bit 18", Curve::kViviani, 3, 2 + 262144}));
+INSTANTIATE_TEST_SUITE_P(Ynchem, ClosedCurves,
+                         ::testing::Values(ClosedCase{Curve::kCircle, 2, 2, {1, 2, 3}},
+                                           ClosedCase{Curve::kCircle, 2, 4, {1, 3, 6}},
+                                           ClosedCase{Curve::kCircle, 2, 4 + 32768, {1, 2, 3}},
+                                           ClosedCase{Curve::kCircle, 2, 8, {1, 3, 6}},
+                                           ClosedCase{Curve::kCircle4, 4, 8, {1, 2, 3, 6}},
+                                           // n = 12: workspace at every tangent
+                                           ClosedCase{Curve::kCircleN, 12, 4, {1, 2, 3, 6}},
+                                           ClosedCase{Curve::kViviani, 3, 4, {1, 2, 3, 6}},
+                                           ClosedCase{Curve::kViviani, 3, 2 + 262144, {1, 2, 3}}));
 
 TEST(Ynchem, EllipseEndsExactlyOnTheFaceItLeaves) {
-  // x^2/4 + y^2 = 1 from (0, 1) to the right: leaves the box |x| <= 1.5 at
-  // (1.5, sqrt(1 - 2.25/4)) = (1.5, 0.661437827766147...).
+  // x^2/4 + y^2 = 1 from (0, 1) to the right leaves |x| <= 1.5 at (1.5, sqrt(0.4375)).
   Curve c(Curve::kEllipse, 2, 4.0);
-  PathSetup s = setup({0.0, 1.0}, {1.0, 0.0}, 2.0, 1e-4, 0.25);
-  s.box[0] = -1.5, s.box[2] = 1.5;
-  const Traced t = trace(c, s);
-  ASSERT_EQ(t.result, 0);
-  EXPECT_EQ(t.ierr, 0);
-  expect_sound_path(c, s, t, 2);
-  const double* last = t.x(t.count - 1);
-  EXPECT_EQ(bits(last[0]), bits(1.5));
-  EXPECT_NEAR(last[1], 0.66143782776614765, 1e-9);
-  EXPECT_GT(last[2], 0.0);  // still heading right
+  Traced r({0.0, 1.0}, {1.0, 0.0}, 2.0, 1e-4, 0.25);
+  r.box[0] = -1.5, r.box[2] = 1.5;
+  trace(c, r);
+  ASSERT_EQ(r.result, 0);
+  expect_sound_path(c, r, 2);
+  EXPECT_EQ(bits(r.x(r.count - 1, 2)[0]), bits(1.5));
+  EXPECT_NEAR(r.x(r.count - 1, 2)[1], 0.66143782776614765, 1e-9);
 }
 
 TEST(Ynchem, PointLimitHoldsForSmallSystemsOnly) {
-  // A unit circle with steps of 0.9 * 0.001: about 6981 points. n = 3 stops at the 5001st.
+  // A unit circle in steps of 0.9 * 0.001: x0, 6981 full steps (2 pi / 0.0009 = 6981.3), then
+  // x0 again, 6983 points; n = 3 stops at the 5001st.
   for (std::int32_t n : {3, 5}) {
     Curve c(Curve::kCircleN, n);
     std::vector<double> x0(n, 0.0), d0(n, 0.0);
     x0[0] = 1.0, d0[1] = 1.0;
-    PathSetup s = setup(x0, d0, 3.0, 1e-5, 0.25);
-    s.mode = 2;
-    s.tol[0] = 0.001;
-    const Traced t = trace(c, s);
-    if (n == 3) {
-      EXPECT_EQ(t.result, 1);
-      EXPECT_EQ(t.ierr, 4720);
-      EXPECT_EQ(t.itab, 0);
-      EXPECT_EQ(t.frames, (std::vector<Frame>{{4720, "YNCHEM  ", 8}}));
-    } else {
-      ASSERT_EQ(t.result, 0);
-      EXPECT_GT(t.count, 6900);
-      EXPECT_LT(t.count, 7100);
-    }
+    Traced r(x0, d0, 3.0, 1e-5, 0.25);
+    r.mode = 2, r.tol[0] = 0.001;
+    trace(c, r);
+    EXPECT_EQ(r.ierr, n == 3 ? 4720 : 0);
+    EXPECT_NEAR(r.count, n == 3 ? 0 : 6983, 1);
+    const std::vector<Frame> frames{{4720, "YNCHEM  ", 8}};
+    EXPECT_EQ(r.frames, n == 3 ? frames : std::vector<Frame>{});
   }
 }
 
-struct RefusedCase {
+struct FailCase {
   const char* what;
-  std::vector<double> x0, d0;
-  double pas_lo;
-  std::int32_t n, mode, store, ierr;
+  std::int32_t n, mode, store;
+  double dx, dy, pas_lo;  // d0 = (dx, dy, 0...) from x0 = (1, 0, ...) in the box |x_i| <= 1
+  std::int32_t fail_code;
+  std::size_t fail_after;
+  std::int32_t ierr;
   std::vector<Frame> frames;
 };
 
-class Refusals : public ::testing::TestWithParam<RefusedCase> {};
+class Failures : public ::testing::TestWithParam<FailCase> {};
 
-TEST_P(Refusals, LeaveNoTableAndTheirFrame) {
-  const RefusedCase& k = GetParam();
-  Curve c(Curve::kCircle, 2);
-  PathSetup s = setup(k.x0, k.d0, 1.0, k.pas_lo, 0.25);
-  s.mode = k.mode;
-  s.store = k.store;
-  s.xd.resize(40, 0.0), s.box.resize(40, 1.0), s.pas.resize(40, 0.5), s.tol.resize(20, 0.01);
-  c.n = k.n;
-  const Traced t = trace(c, s);
-  EXPECT_EQ(t.result, 1) << k.what;
-  EXPECT_EQ(t.ierr, k.ierr) << k.what;
-  EXPECT_EQ(t.itab, 0) << k.what;
-  EXPECT_EQ(t.frames, k.frames) << k.what;
+TEST_P(Failures, LeaveNoTableAndTheirFrames) {
+  const FailCase& k = GetParam();
+  Curve c(k.n == 2 ? Curve::kCircle : Curve::kCircleN, k.n);
+  c.fail_code = k.fail_code, c.fail_after = k.fail_after;
+  std::vector<double> x0(k.n, 0.0), d0(k.n, 0.0);
+  x0[0] = 1.0, d0[0] = k.dx, d0[1] = k.dy;
+  Traced r(x0, d0, 1.0, k.pas_lo, 0.25);
+  r.mode = k.mode, r.store = k.store;
+  trace(c, r);
+  EXPECT_EQ(r.result, 1) << k.what;
+  EXPECT_EQ(r.ierr, k.ierr) << k.what;
+  EXPECT_EQ(r.itab, 0) << k.what;
+  EXPECT_EQ(r.frames, k.frames) << k.what;
 }
 
-const std::vector<Frame> kNone;
+Frame ynchem_frame(std::int32_t code) { return {code, "YNCHEM  ", 8}; }
 
-INSTANTIATE_TEST_SUITE_P(
-    Ynchem, Refusals,
-    ::testing::Values(
-        RefusedCase{"n 1", {1, 0}, {0, 1}, 1e-4, 1, 4, 10, 4712, {{4712, "YNCHEM  ", 8}}},
-        RefusedCase{"n 21", {1, 0}, {0, 1}, 1e-4, 21, 4, 10, 4718, {{4718, "YNCHEM  ", 8}}},
-        RefusedCase{"kind 1", {1, 0}, {0, 1}, 1e-4, 2, 1, 10, 4718, {{4718, "YNCHEM  ", 8}}},
-        RefusedCase{"store bit 0", {1, 0}, {0, 1}, 1e-4, 2, 4, 3, 4718, {{4718, "YNCHEM  ", 8}}},
-        RefusedCase{"off the curve", {0.5, 0}, {0, 1}, 1e-4, 2, 4, 10, 4712,
-                    {{4712, "YNCHEM  ", 8}}},
-        // On the face x = 1 pointing out: no table, no frame.
-        RefusedCase{"face pointing out", {1, 0}, {1, 0}, 1e-4, 2, 4, 10, 4721, kNone},
-        // Every move below the minimum steps: the first step collapses, one point.
-        RefusedCase{"first step collapses", {1, 0}, {0, 1}, 0.2, 2, 2, 10, 4721, kNone},
-        // A start direction that is not a number: the first prediction is not finite.
-        RefusedCase{"d0 not a number", {1, 0}, {0, NAN}, 1e-4, 2, 4, 10, 4713,
-                    {{4713, "WNCGOO  ", 8}, {4713, "YNCHEM  ", 8}}}));
-
-TEST(Ynchem, EvaluationRoutineSeesTheContextAndTheStatedRequests) {
-  // n = 2, K = 4: residuals at x0 (1), tangents with second derivatives (6), Newton (3).
-  // n = 3, K = 2: residuals (1), tangents (2), frozen gradients and Newton (2, 3).
-  for (std::int32_t n : {2, 3}) {
-    Curve c(n == 2 ? Curve::kCircle : Curve::kSpherePlane, n);
-    std::vector<double> x0(n, 0.0), d0(n, 0.0);
-    x0[0] = 1.0, d0[1] = 1.0;
-    PathSetup s = setup(x0, d0, 2.0, 1e-4, 0.25);
-    s.mode = n == 2 ? 4 : 2;
-    ASSERT_EQ(trace(c, s).result, 0);
-    EXPECT_EQ(c.reqs[0], 1);
-    EXPECT_EQ(c.reqs[1], n == 2 ? 6 : 2);
-    for (std::size_t k = 0; k < c.reqs.size(); ++k) {
-      const std::int32_t r = c.reqs[k];
-      EXPECT_TRUE(r == 1 || r == 3 || r == (n == 2 ? 6 : 2)) << k << ": " << r;
-      EXPECT_EQ(c.npts[k], 1);
-    }
-  }
-}
-
-TEST(Ynchem, FailuresOfTheEvaluationRoutineArePassedOnWithTheirFrames) {
-  struct Case {
-    std::int32_t n, code;
-    std::size_t after;
-    std::int32_t ierr;
-    std::vector<Frame> frames;
-  };
-  const Case cases[] = {
-      // In the first correction of a two-unknown path: wncgf2, wncgoo, ynchem.
-      {2, 4242, 2, 4242, {{4242, "WNCGF2;", 7}, {4242, "WNCGOO  ", 8}, {4242, "YNCHEM  ", 8}}},
-      {3, 4242, 2, 4242, {{4242, "WNCGOO  ", 8}, {4242, "YNCHEM  ", 8}}},
-      // 4716 in a two-unknown correction reads as an iterate leaving the box (no frame):
-      // the step halves until it collapses, at the first step.
-      {2, 4716, 2, 4721, {}},
-      // 4715 to the tangent request at x0 becomes 4718.
-      {2, 4715, 1, 4718, {{4718, "YNCHEM  ", 8}}},
-  };
-  for (const Case& k : cases) {
-    Curve c(k.n == 2 ? Curve::kCircle : Curve::kSpherePlane, k.n);
-    c.fail_code = k.code;
-    c.fail_after = k.after;
-    std::vector<double> x0(k.n, 0.0), d0(k.n, 0.0);
-    x0[0] = 1.0, d0[1] = 1.0;
-    const Traced t = trace(c, setup(x0, d0, 2.0, 1e-4, 0.25));
-    EXPECT_EQ(t.result, 1) << k.code;
-    EXPECT_EQ(t.ierr, k.ierr);
-    EXPECT_EQ(t.itab, 0);
-    EXPECT_EQ(t.frames, k.frames) << k.n << " " << k.code;
-  }
-}
+// clang-format off
+INSTANTIATE_TEST_SUITE_P(Ynchem, Failures, ::testing::Values(
+    FailCase{"store bit 0", 2, 4, 3, 0, 1, 1e-4, 0, 0, 4718, {ynchem_frame(4718)}},
+    FailCase{"face pointing out", 2, 4, 10, 1, 0, 1e-4, 0, 0, 4721, {}},
+    FailCase{"first step collapses", 2, 2, 10, 0, 1, 0.2, 0, 0, 4721, {}},
+    FailCase{"d0 not a number", 2, 4, 10, 0, NAN, 1e-4, 0, 0, 4713,
+             {{4713, "WNCGOO  ", 8}, ynchem_frame(4713)}},
+    FailCase{"routine fails in a correction, n 2", 2, 4, 10, 0, 1, 1e-4, 4242, 2, 4242,
+             {{4242, "WNCGF2;", 7}, {4242, "WNCGOO  ", 8}, ynchem_frame(4242)}},
+    FailCase{"routine fails in a correction, n 3", 3, 4, 10, 0, 1, 1e-4, 4242, 2, 4242,
+             {{4242, "WNCGOO  ", 8}, ynchem_frame(4242)}},
+    // wncgf2 takes the routine's 4716 for an iterate leaving the box: the steps collapse.
+    FailCase{"routine gives 4716, n 2", 2, 4, 10, 0, 1, 1e-4, 4716, 2, 4721, {}},
+    FailCase{"routine gives 4715 for the tangent", 2, 4, 10, 0, 1, 1e-4, 4715, 1, 4718,
+             {ynchem_frame(4718)}}));
+// clang-format on
 
 TEST(Ynchem, ValuesThatAreNotFiniteEndThePathByCollapse) {
-  // From some call on, every value the routine gives is NaN or infinite: the corrections
-  // fail, the step halves down to the minimum steps and the path ends with what it holds.
+  // From call 40 on every value is NaN or infinite: corrections fail, the step halves down to
+  // the minimum steps and the path ends with what it holds; from call 2 on, at its start.
   for (double poison : {std::nan(""), HUGE_VAL, -HUGE_VAL}) {
-    for (std::int32_t n : {2, 3}) {
-      Curve c(n == 2 ? Curve::kCircle : Curve::kSpherePlane, n);
-      c.poison = poison;
-      c.poison_after = 40;
-      std::vector<double> x0(n, 0.0), d0(n, 0.0);
-      x0[0] = 1.0, d0[1] = 1.0;
-      PathSetup s = setup(x0, d0, 2.0, 1e-4, 0.25);
-      const Traced t = trace(c, s);
-      ASSERT_EQ(t.result, 0) << poison << " " << n;
-      EXPECT_GT(t.count, 1);
-      expect_sound_path(c, s, t, 1);  // no end point: the last one keeps phase 1
-      // From the first step on: the start point alone, 4721.
-      Curve d(c.kind, n);
-      d.poison = poison;
-      d.poison_after = 2;
-      const Traced u = trace(d, s);
-      EXPECT_EQ(u.result, 1);
-      EXPECT_EQ(u.ierr, 4721);
+    for (std::size_t after : {std::size_t{40}, std::size_t{2}}) {
+      Curve c(Curve::kSpherePlane, 3);
+      c.poison = poison, c.poison_after = after;
+      Traced r({1, 0, 0}, {0, 1, 0}, 2.0, 1e-4, 0.25);
+      trace(c, r);
+      EXPECT_EQ(r.ierr, after == 2 ? 4721 : 0) << poison;
+      if (after == 40) expect_sound_path(c, r, 1);  // no end point: the last keeps phase 1
     }
   }
 }
 
 TEST(Ynchem, WithoutRecordKind2TheLookupQuirkDecides) {
-  // Fresh threads, so the lookup count starts at 0.
-  std::thread([] {
+  std::thread([] {  // a fresh thread: the lookup count starts at 0
     Curve c(Curve::kCircle, 2);
-    PathSetup s = setup({1.0, 0.0}, {0.0, 1.0}, 2.0, 1e-4, 0.25);
-    s.store = 2;  // kind 23 only: yncrea fails, the path is returned with 4712
-    const Traced t = trace(c, s);
-    EXPECT_EQ(t.result, 0);
-    EXPECT_EQ(t.ierr, 4712);
-    EXPECT_GT(t.count, 20);
-    EXPECT_EQ(t.frames, (std::vector<Frame>{{4712, " YNCREA ", 8}}));
-  }).join();
-  std::thread([] {
-    Curve c(Curve::kCircle, 2);
-    PathSetup collapse = setup({1.0, 0.0}, {0.0, 1.0}, 2.0, 0.2, 0.25);
-    EXPECT_EQ(trace(c, collapse).ierr, 4721);  // leaves the count 1 behind
-    PathSetup s = setup({1.0, 0.0}, {0.0, 1.0}, 2.0, 1e-4, 0.25);
-    s.store = 2;
-    const Traced t = trace(c, s);  // the whole circle, then released as a single point
-    EXPECT_EQ(t.result, 1);
-    EXPECT_EQ(t.ierr, 4721);
-    EXPECT_EQ(t.itab, 0);
-  }).join();
-}
-
-TEST(Ynchem, LeavesNoWorkspaceBlockBehind) {
-  // n = 12 with second derivatives: the tangent routine takes workspace at every point.
-  Curve c(Curve::kCircleN, 12);
-  std::vector<double> x0(12, 0.0), d0(12, 0.0);
-  x0[0] = 1.0, d0[1] = 1.0;
-  const WorkspaceWatch ws;
-  const Traced t = trace(c, setup(x0, d0, 2.0, 1e-4, 0.25));
-  EXPECT_EQ(t.result, 0);
-  EXPECT_GT(ws.requests(), t.count);
-  EXPECT_EQ(ws.outstanding(), 0);
-  ws.refuse_next(1);  // refused at the tangent of x0: 36
-  const Traced u = trace(c, setup(x0, d0, 2.0, 1e-4, 0.25));
-  EXPECT_EQ(u.ierr, 36);
-  EXPECT_EQ(ws.outstanding(), 0);
+    Traced r({1.0, 0.0}, {0.0, 1.0}, 2.0, 1e-4, 0.25);
+    r.store = 2;  // kind 23 only: returned with 4712 and yncrea's frame
+    trace(c, r);
+    EXPECT_EQ(r.result, 0);
+    EXPECT_EQ(r.ierr, 4712);
+    EXPECT_GT(r.count, 20);
+    EXPECT_EQ(r.frames, (std::vector<Frame>{{4712, " YNCREA ", 8}}));
+    Traced collapse({1.0, 0.0}, {0.0, 1.0}, 2.0, 0.2, 0.25);
+    trace(c, collapse);  // one point: leaves the count 1 behind
+    trace(c, r);         // the whole circle again, now released as a single point
+    EXPECT_EQ(r.result, 1);
+    EXPECT_EQ(r.ierr, 4721);
+  })
+      .join();
 }
 
 }  // namespace

@@ -12,6 +12,8 @@ TEST(Cor, HornerOrderAndEmptyPolynomial) {
   double t = 2;
   EXPECT_EQ(cor(c, &m, &t), 17.0);
   EXPECT_EQ(cor(nullptr, &zero, &t), 0.0);  // c not read
+  std::int32_t lowest = INT32_MIN;             // m - 1 is not formed for it
+  EXPECT_EQ(bits(cor(nullptr, &lowest, &t)), bits(0.0));
   // t^2 - 1 at t = 1 + 2^-30 by Horner, (t * t) - 1: 2^-29 + 2^-60 rounds to 2^-29.
   t = 1 + 0x1p-30;
   EXPECT_EQ(bits(cor(d, &m, &t)), bits(0x1p-29));
