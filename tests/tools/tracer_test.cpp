@@ -41,6 +41,7 @@ TEST(CheckPlan, DefaultsFollowTheBoxAndThePathKind) {
 }
 
 struct Refusal {
+  const char* name;
   std::vector<std::string> equations;
   std::vector<double> start;
   std::int32_t kind;
@@ -65,21 +66,23 @@ TEST_P(CheckPlanRefuses, NamingTheProblem) {
   }
 }
 
+// clang-format off
 INSTANTIATE_TEST_SUITE_P(
     Tracer, CheckPlanRefuses,
     ::testing::Values(
-        Refusal{{"x"}, {0, 0, 0}, 4, {}, {}, "1 equation in 3 unknowns"},
-        Refusal{{"x", "y"}, {0, 0}, 4, {}, {}, "start point: 2 values given, expected 3"},
-        Refusal{{"x", "y"}, {0, 0, 0}, 8, {0.1, 0.1, 0.1}, {}, "kind 8 takes a single"},
-        Refusal{{"x", "y"}, {0, 0, 0}, 4, {0.1, 0.1}, {}, "tolerance: 2 values given"},
-        Refusal{{"x", "y"}, {0, 0, 0}, 4, {}, {0.5}, "need 0 < minimum < maximum"},
-        Refusal{{"x", "y"}, {0, 0, 1.5}, 4, {}, {}, "z = 1.5 lies outside its box range"},
-        Refusal{{"x", "y - 0.125"},
-                {0, 0, 0},
-                4,
-                {},
-                {},
-                "sum of squared residuals 0.0156 > eps 1e-20 (--snap"}));
+        Refusal{"EquationCount", {"x"}, {0, 0, 0}, 4, {}, {}, "1 equation in 3 unknowns"},
+        Refusal{"StartSize", {"x", "y"}, {0, 0}, 4, {}, {},
+                "start point: 2 values given, expected 3"},
+        Refusal{"Kind8PerUnknown", {"x", "y"}, {0, 0, 0}, 8, {0.1, 0.1, 0.1}, {},
+                "kind 8 takes a single"},
+        Refusal{"TolSize", {"x", "y"}, {0, 0, 0}, 4, {0.1, 0.1}, {}, "tolerance: 2 values given"},
+        Refusal{"StepOrder", {"x", "y"}, {0, 0, 0}, 4, {}, {0.5}, "need 0 < minimum < maximum"},
+        Refusal{"StartOutside", {"x", "y"}, {0, 0, 1.5}, 4, {}, {},
+                "z = 1.5 lies outside its box range"},
+        Refusal{"OffCurve", {"x", "y - 0.125"}, {0, 0, 0}, 4, {}, {},
+                "sum of squared residuals 0.0156 > eps 1e-20 (--snap"}),
+    [](const ::testing::TestParamInfo<Refusal>& info) { return std::string(info.param.name); });
+// clang-format on
 
 TEST(CheckPlan, SnapMovesANearbyStartOntoTheCurve) {
   EquationSystem s({"x", "y"}, {"x^2 + y^2 - 1"});
