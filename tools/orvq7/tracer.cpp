@@ -175,9 +175,9 @@ void check_plan(EquationSystem& system, TracePlan& plan) {
   const std::size_t n = system.unknowns(), m = system.equations();
   if (m + 1 != n)
     throw ToolError(
-        fmt::format("{} equations in {} unknowns: a curve needs n - 1 equations in "
-                    "n unknowns",
-                    m, n));
+        fmt::format("{} equation{} in {} unknowns: a curve needs n - 1 equations "
+                    "in n unknowns",
+                    m, m == 1 ? "" : "s", n));
   if (n < 2 || n > static_cast<std::size_t>(kMaxUnknowns))
     throw ToolError(fmt::format("{} unknowns: the solver takes 2 to {}", n, kMaxUnknowns));
   auto need = [n](const std::vector<double>& v, const char* what) {
@@ -197,6 +197,8 @@ void check_plan(EquationSystem& system, TracePlan& plan) {
   std::vector<double> scales(n);
   for (std::size_t i = 0; i < n; ++i) {
     const double w = plan.upper[i] - plan.lower[i];
+    if (!(w > 0.0))
+      throw ToolError(fmt::format("box: the range of {} is empty", system.names()[i]));
     if (!std::isfinite(w))
       throw ToolError(fmt::format("box: the range of {} is too wide", system.names()[i]));
     wmin = i == 0 ? w : std::min(wmin, w);

@@ -1,4 +1,4 @@
-// path/special_points.cpp -- tests of a new path point and special points: wnctes, wnctfe,
+// path/path_events.cpp -- tests of a new path point and special points: wnctes, wnctfe,
 // wnctop, wnctob, wnccar, wncver. After a correction: has the path closed on its start point
 // or left the box (then where does it end on the face)? Then: is the step acceptable, how is
 // the point stored, and the march record advances to it.

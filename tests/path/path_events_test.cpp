@@ -1,4 +1,4 @@
-// tests/path/special_points_test.cpp -- checks for path/special_points.cpp: wnctop, wnctes
+// tests/path/path_events_test.cpp -- checks for path/path_events.cpp: wnctop, wnctes
 // (with wnctob and the quadratic model), wnccar, wncver.
 #include <gtest/gtest.h>
 
