@@ -274,7 +274,8 @@ void fuzz_march(Input& in) {
       FUZZ_CHECK("yncrea", e == 4712 && handle == fuzz::kSentinelInt && count == fuzz::kSentinelInt);
       FUZZ_CHECK("yncrea", fr.size() == 1 && fr[0].name == " YNCREA " && fr[0].code == 4712);
     }
-    if (kind == 23) FUZZ_CHECK("yncrea", yr == 0 && count == r->march.nstored);
+    if (kind == 23 && r->layout.slot[1].used)  // the points and tangents, when asked for
+      FUZZ_CHECK("yncrea", yr == 0 && count == r->march.nstored);
     yc.released();
   }
   FUZZ_CHECK("yncend", yncend(&r->itab, &e) == 0 && e == 0);
@@ -464,7 +465,8 @@ void fuzz_ynchem(Input& in) {
   } else {
     FUZZ_CHECK("ynchem", itab != 0 && (ierr == 0 || ierr == 4712));
     if (ierr == 4712) FUZZ_CHECK("ynchem", (store & 56) == 0);
-    // Every stored point in the box (inclusive), the first one x0 itself.
+    // Every stored point in the box (inclusive; an end point on a face may lie outside the
+    // other faces by at most 1e-12), the first one x0 itself.
     const std::int32_t kind = 23;
     std::int32_t h = 0, count = 0, e = 0, first = 1;
     FUZZ_CHECK("ynchem", yncrea(&itab, &kind, &h, &count, &e) == 0 && count >= 1);
@@ -474,7 +476,12 @@ void fuzz_ynchem(Input& in) {
     for (std::size_t j = 0; j < std::size_t(count); ++j)
       for (std::size_t i = 0; i < sn; ++i) {
         const double v = xt[j * 2 * sn + i];
-        FUZZ_CHECK("ynchem", v >= box[i] && v <= box[sn + i]);
+        const bool inside = v >= box[i] - 1e-12 && v <= box[sn + i] + 1e-12;
+        if (!inside) {  // shown with the arguments
+          a.real(v);
+          a.i32s({static_cast<std::int32_t>(j), static_cast<std::int32_t>(i), count});
+        }
+        FUZZ_CHECK("ynchem", inside);
       }
     FUZZ_CHECK("yncend", yncend(&itab, &e) == 0);
     tables.released("ynchem");
