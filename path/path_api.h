@@ -472,8 +472,8 @@ ORVQ7_API int32_t wncgcv(void* ctx, const int32_t* n, Orvq7PathFct fct, const do
  *   p      in   real(n)    the start of the iteration
  *   box    in   real(2,n)  (lower, upper) of each unknown
  *   xnew   out  real(n)    the kept iterate: the last whose residual norm decreased
- *                          strictly, p before any; written on every return but fct's failure
- *                          and the argument errors
+ *                          strictly, p before any; written on every return but the argument
+ *                          errors (also when fct fails)
  *   rnorm  out  real       its residual norm (sum of squares of the n-1 residuals); 1e38 for
  *                          p before its evaluation
  *   ierr   out  int32      status code
