@@ -18,8 +18,13 @@ const double kRigid[12] = {0, 1, 0, 0, 0, -1, -1, 0, 0, 2.5, -1.25, 4};
 // Identity plus the translation (1, -2, 0.5): every transformed coordinate is exact.
 const double kShift[12] = {1, 0, 0, 0, 1, 0, 0, 0, 1, 1, -2, 0.5};
 using Point = std::array<double, 3>;
-using Apply = std::int32_t (*)(const double*, const double*, const double*, const double*,
-                               double*, double*, double*);
+using Apply = decltype(&fmat6);
+using Ints = std::vector<std::int32_t>;
+template <int F, int P>
+struct Record {  // F 16-bit header fields (two bytes of padding), then P reals
+  std::int16_t field[F];
+  double point[P];
+};
 
 Point apply(Apply f, Point p, const double* a) {
   Point r;
@@ -39,24 +44,19 @@ TEST(Fmat6, AppliesComposesAndInverts) {
   // -4.25) under kAffine, then to (6.75, -1, 4.5) under kRigid. A signed permutation and its
   // inverse round each +-(p_k - t_k) once.
   const Point p = {1.5, -2, 0.25}, q = {0.3, -7.1, 2.9}, perm = {-7.1 + 1.25, 4 - 2.9, 2.5 - 0.3};
-  const struct {
-    Apply f;
-    const double* a;
-    Point p, want;
-  } cases[] = {{fmat6, kAffine, p, {1.75, -3.75, 1.25}}, {fmat61, kAffine, p, {-1.25, 1.25, -5.75}},
-               {fmat8, kAffine, p, {10.5, -11.25, 24.75}}, {fmat81, kAffine, p, {0.5, 2.75, -4.25}},
-               {fmat6, ab, {0.5, -1.25, 3}, {6.75, -1, 4.5}}, {fmat8, kRigid, q, perm},
-               {fmat6, inv, q, perm}};
-  for (const auto& k : cases) EXPECT_EQ(apply(k.f, k.p, k.a), k.want);
-  for (const double* first : {kRigid, static_cast<const double*>(inv)}) {
-    fmat4(first, first == kRigid ? inv : kRigid, r);
-    expect_bits(r, {1, 0, 0, 0, 1, 0, 0, 0, 1, 0, 0, 0});  // x + (-x) = +0
-  }
+  const Apply f[7] = {fmat6, fmat61, fmat8, fmat81, fmat6, fmat8, fmat6};
+  const double* a[7] = {kAffine, kAffine, kAffine, kAffine, ab, kRigid, inv};
+  const Point in[7] = {p, p, p, p, {0.5, -1.25, 3}, q, q};
+  const Point want[7] = {{1.75, -3.75, 1.25}, {-1.25, 1.25, -5.75}, {10.5, -11.25, 24.75},
+                         {0.5, 2.75, -4.25},  {6.75, -1, 4.5},      perm, perm};
+  for (int k = 0; k < 7; ++k) EXPECT_EQ(apply(f[k], in[k], a[k]), want[k]) << k;
+  fmat4(kRigid, inv, r);
+  expect_bits(r, {1, 0, 0, 0, 1, 0, 0, 0, 1, 0, 0, 0});  // M^T T + (-(M^T T)) = +0
   // Row (1, 1, 1), p = (1, e, e), t1 = e, e = 2^-53: left to right, each e is a tie rounded
   // back to 1; any other grouping keeps at least 2^-52. Outputs on the inputs.
-  const double e = 0x1p-53, a[12] = {1, 0, 0, 1, 0, 0, 1, 0, 0, e, 0, 0};
+  const double e = 0x1p-53, ones[12] = {1, 0, 0, 1, 0, 0, 1, 0, 0, e, 0, 0};
   double x = 1, y = e, z = e;
-  fmat6(&x, &y, &z, a, &x, &y, &z);
+  fmat6(&x, &y, &z, ones, &x, &y, &z);
   EXPECT_EQ(bits(x), bits(1.0));
   // A p = (2x - y + 0.5, x + 3y - 2), B (u, v) = (4 - v, u + 1):
   // B after A = (-x - 3y + 6, 2x - y + 1.5).
@@ -67,8 +67,7 @@ TEST(Fmat6, AppliesComposesAndInverts) {
 }
 
 TEST(Inmat3, InversesThroughOneReciprocalAndSingularThresholds) {
-  double b[13];
-  b[12] = 99;
+  double b[13] = {0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 99};
   std::int32_t flag = -1;
   inmat3(kAffine, b, &flag);
   EXPECT_EQ(flag, 0);
@@ -102,29 +101,24 @@ TEST(Inmat3, InversesThroughOneReciprocalAndSingularThresholds) {
   }
   // fmat1: the nine reals of the inverse; a singular call gives back the last regular one.
   const double zero[9] = {};
-  b[9] = 99;
-  fmat1(kAffine, b, &flag);
-  EXPECT_EQ(flag, 0);
-  expect_bits(b, {1.25, -2, -1.5, -1, 1, 1, -0.75, 1, 0.5, 99});
-  for (double& v : b) v = -1;
-  fmat1(zero, b, &flag);
-  EXPECT_EQ(flag, 1);
-  expect_bits(b, {1.25, -2, -1.5, -1, 1, 1, -0.75, 1, 0.5, -1});
+  for (const double* m : {kAffine, zero}) {
+    for (double& v : b) v = -1;
+    fmat1(m, b, &flag);
+    EXPECT_EQ(flag, m == zero ? 1 : 0);
+    expect_bits(b, {1.25, -2, -1.5, -1, 1, 1, -0.75, 1, 0.5, -1});
+  }
 }
 
 TEST(Fmat23, ProductSummationOrderAndEmptyOrders) {
   // [[1, 2, 3], [4, 5, 6]] [[7, 8], [9, 10], [11, 12]] = [[58, 64], [139, 154]].
   const double a[6] = {1, 4, 2, 5, 3, 6}, b[6] = {7, 9, 11, 8, 10, 12};
   double r[5] = {0, 0, 0, 0, 99};
-  std::int32_t n = 2, m = 3, p = 2, one = 1, five = 5;
+  const std::int32_t n = 2, m = 3, p = 2, one = 1, five = 5, zero = 0;
   fmat23(&n, &m, &p, a, b, r);
   expect_bits(r, {58, 139, 64, 154, 99});
-  for (std::int32_t* bad : {&n, &m, &p}) {
-    const std::int32_t keep = *bad;
-    *bad = 0;
-    fmat23(&n, &m, &p, a, b, r + 2);
-    *bad = keep;
-  }
+  fmat23(&zero, &m, &p, a, b, r + 2);
+  fmat23(&n, &zero, &p, a, b, r + 2);
+  fmat23(&n, &m, &zero, a, b, r + 2);
   expect_bits(r + 2, {64, 154, 99});
   // Five rows (1, 1, 1) times (1, e, e), e = 2^-53: by increasing k both e are ties rounded
   // back to 1 in every row; with (e, e, 1) they add up first and stay.
@@ -149,29 +143,22 @@ TEST(Records, GridsAndRecordsMoveOnlyTheirPoints) {
   // A curve record: seven 16-bit fields, then the points from byte 16; dimension in field
   // 2, point count in field 5. A surface: eleven fields, points from byte 24, counts in
   // fields 7 and 8. The output header is not written; a plane curve is left alone.
-  struct {
-    std::int16_t field[8];
-    double point[9];
-  } curve{{0, 3, 0, 0, 2}, {0, 1, 2, 3, 4, 5, 6, 7, 8}}, cout{{77}, {}};
+  Record<8, 9> curve{{0, 3, 0, 0, 2}, {0, 1, 2, 3, 4, 5, 6, 7, 8}}, cout{{77}, {}};
   rbctra(kShift, &curve, &cout);
   expect_bits(cout.point, {1, -1, 2.5, 4, 2, 5.5, 0});
   EXPECT_EQ(cout.field[0], 77);
   curve.field[1] = 2;
   rbctra(kShift, &curve, &curve);
   EXPECT_EQ(curve.point[0], 0.0);
-  struct {
-    std::int16_t field[12];
-    double point[15];
-  } surf{{0, 0, 0, 0, 0, 0, 2, 2}, {0, 1, 2, 3, 4, 5, 6, 7, 8, 9, 10, 11, 12}}, sout{};
+  Record<12, 15> surf{{0, 0, 0, 0, 0, 0, 2, 2}, {0, 1, 2, 3, 4, 5, 6, 7, 8, 9, 10, 11, 12}};
+  Record<12, 15> sout{};
   rbstra(kShift, &surf, &sout);
   expect_bits(sout.point + 9, {10, 8, 11.5, 0});
   // Header fields in their order, sign-extended: 1 2 5 7 3 4 6 and 1 2 7 8 11 3 5 9 4 6 10.
   const std::int16_t c[11] = {11, -12, 13, 14, 15, 16, -32768, -108, 109, 110, 111};
   std::int32_t o[11];
   rbclcp(c, &o[0], &o[1], &o[2], &o[3], &o[4], &o[5], &o[6]);
-  EXPECT_EQ(std::vector<std::int32_t>(o, o + 7),
-            (std::vector<std::int32_t>{11, -12, 15, -32768, 13, 14, 16}));
+  EXPECT_EQ(Ints(o, o + 7), (Ints{11, -12, 15, -32768, 13, 14, 16}));
   rbslcp(c, &o[0], &o[1], &o[2], &o[3], &o[4], &o[5], &o[6], &o[7], &o[8], &o[9], &o[10]);
-  EXPECT_EQ(std::vector<std::int32_t>(o, o + 11),
-            (std::vector<std::int32_t>{11, -12, -32768, -108, 111, 13, 15, 109, 14, 16, 110}));
+  EXPECT_EQ(Ints(o, o + 11), (Ints{11, -12, -32768, -108, 111, 13, 15, 109, 14, 16, 110}));
 }

@@ -25,19 +25,15 @@ TEST(Products, ByHandWithSignedZerosAndRoundingOrder) {
   // vector; the plane cases write zeros, parvis its third component.
   const double x = 0x1.00000004p+0, px[3] = {x, 0x1.00000008p+0, 0}, qx[3] = {1, x, 0};
   const double e1[3] = {2, 0, 0}, e3[3] = {0, 0, -3}, par[3] = {-2, -4, -6};
-  using Cross = std::int32_t (*)(const double*, const double*, double*, const std::int32_t*);
-  const struct {
-    Cross f;
-    const double *u, *v;
-    std::int32_t dim;
-    double want[3];
-  } cases[] = {{parvis, a, b, 3, {6.5, -10, 4.5}}, {parvis, a, b, 2, {0, 0, 4.5}},
-               {parvis, px, qx, 2, {0, 0, 0}},     {parbis, e1, e3, 3, {-0.0, 1, 0}},
-               {parbis, a, par, 3, {0, 0, 0}},     {parbis, e1, e3, 2, {0, 0, 0}}};
-  for (const auto& k : cases) {
+  const decltype(&parvis) f[6] = {parvis, parvis, parvis, parbis, parbis, parbis};
+  const double *u[6] = {a, a, px, e1, a, e1}, *v[6] = {b, b, qx, e3, par, e3};
+  const std::int32_t dim[6] = {3, 2, 2, 3, 3, 2};
+  const double want[6][3] = {{6.5, -10, 4.5}, {0, 0, 4.5}, {0, 0, 0},
+                             {-0.0, 1, 0},    {0, 0, 0},   {0, 0, 0}};
+  for (int k = 0; k < 6; ++k) {
     double w[3] = {9, 9, 9};
-    EXPECT_EQ(k.f(k.u, k.v, w, &k.dim), 0);
-    expect_bits(w, {k.want[0], k.want[1], k.want[2]});
+    EXPECT_EQ(f[k](u[k], v[k], w, &dim[k]), 0);
+    expect_bits(w, {want[k][0], want[k][1], want[k][2]});
   }
 }
 
