@@ -27,7 +27,7 @@ TEST(Traele, EachTypeByHandAtItsTolerances) {
   const double near1[6] = {s1, 0, 0, s1}, far1[6] = {s2, 0, 0, s2}, twice[6] = {2, 0, 0, 2};
   const double stretch[6] = {2, 0, 0, 1}, at5[6] = {2, 0, 0x1p-11, 2}, diag[6] = {1.25, 0, 0, 1};
   const double past5[6] = {2, 0, 0x1.0000000000001p-11, 2}, past4[6] = {1.25, 0, 0, 1 - e};
-  const std::vector<double> g = {3, 4, 0, 1.5, 0, -2, 77, 88};
+  const std::vector<double> g = {3, 4, 0, 1.5, 0, -2, 77, 88}, z2 = {0, 0, 0, 2};  // size 2
   const double beyond = -0x1.c000000000001p-2;  // one ulp beyond 1 - 0.5625, negated
   // {header word, T, element, reals written (the rest stays NaN)}.
   const struct {
@@ -37,12 +37,9 @@ TEST(Traele, EachTypeByHandAtItsTolerances) {
   } cases[] = {
       // Points: (t1 x + t3 y) + t5 with x = 1, y = t5 = 2^-53 is two ties back to 1. Bits 9
       // and up of the header word are ignored; bit 8 adds a point's angle.
-      {80, tie, {1, e}, {1, 0}},
-      {80, kRot2, {3, 4, 0}, {-7, 7}},
-      {80 | 0x7A00, kRot2, {3, 4, 0}, {-7, 7}},
-      {-256 + 80, kRot2, {3, 4, 0}, {-7, 7}},
-      {104, kRot2, {3, 4, 0}, {-7, 7}},
-      {104 | 0x100, kRot2, {3, 4, 0}, {-7, 7, kHalfPi}},
+      {80, tie, {1, e}, {1, 0}}, {80, kRot2, {3, 4, 0}, {-7, 7}},
+      {80 | 0x7A00, kRot2, {3, 4, 0}, {-7, 7}}, {-256 + 80, kRot2, {3, 4, 0}, {-7, 7}},
+      {104, kRot2, {3, 4, 0}, {-7, 7}}, {104 | 0x100, kRot2, {3, 4, 0}, {-7, 7, kHalfPi}},
       // Lines: Q = (1, 0), D = (1, 0), ends at t = -1 and 2.5 go to Q' = (1, 3), D' = (0, 1),
       // parameters doubled. A collapsed direction: only the point. |s - 1| < tol5 keeps the
       // parameters exactly, = tol5 scales them; scaled to tol2 stays, one ulp less snaps to
@@ -80,41 +77,35 @@ TEST(Traele, EachTypeByHandAtItsTolerances) {
       {95, stretch, {3, 4, 0, 1.5, 11, 12, 13, 14}, {6, 4, 0, 1.5, 11, 12, 13, 14}},
       {92, kRot2, g, {-7, 7, kHalfPi, 3, kHalfPi, -4, 77}},
       {85, kRot2, g, {-7, 7, kHalfPi, 3, kHalfPi, -4, 77, 88}},
-      {90, at5, {0, 0, 0, 2}, {0, 0, 0, 4, 0, 0, 0, 0}},
-      {90, past5, {0, 0, 0, 2}, {0, 0, 0, 2, 0, 0, 0, 0}},
-      {90, diag, {0, 0, 0, 2}, {0, 0, 0, 0x1.1e3779b97f4a8p+1, 0, 0, 0, 0}},
-      {90, past4, {0, 0, 0, 2}, {0, 0, 0, 2, 0, 0, 0, 0}},
+      {90, at5, z2, {0, 0, 0, 4, 0, 0, 0, 0}}, {90, past5, z2, {0, 0, 0, 2, 0, 0, 0, 0}},
+      {90, diag, z2, {0, 0, 0, 0x1.1e3779b97f4a8p+1, 0, 0, 0, 0}},
+      {90, past4, z2, {0, 0, 0, 2, 0, 0, 0, 0}},
       // Types with nothing to do.
       {79, kRot2, g, {}}, {84, kRot2, g, {}}, {91, kRot2, g, {}}, {103, kRot2, g, {}},
       {105, kRot2, g, {}}, {0x100, kRot2, g, {}}};
   for (const auto& k : cases) {
-    std::vector<double> in = k.in, out(12, kNaN);
+    std::vector<double> in = k.in, want = k.want, out(12, kNaN);
     in.resize(12, 0.0);
+    want.resize(12, kNaN);
     traele(&k.hdr, k.t, in.data(), nullptr, out.data());
-    for (std::size_t i = 0; i < 12; ++i) {
-      const double want = i < k.want.size() ? k.want[i] : kNaN;
-      EXPECT_EQ(bits(out[i]), bits(want)) << k.hdr << " " << k.in[0] << ": " << i;
-    }
+    for (int i = 0; i < 12; ++i) EXPECT_EQ(bits(out[i]), bits(want[i])) << k.hdr << ": " << i;
   }
 }
 
 TEST(Tr2pt, DirectCallsAndAnglesNotExactlyRounded) {
   // Angle 0 under a rotation by -90 degrees: atan2(-1, 0) + 2 pi, never negative; -0 stays.
-  const double down[6] = {0, -1, 1, 0, 0, 0}, negzero[6] = {1, -0.0, 0, 1, 0, 0};
-  const double zero = 0.0, minus0 = -0.0;
-  EXPECT_EQ(bits(tr2ang(&zero, down)), bits(0x1.2d97c7f3321d2p+2));
-  EXPECT_EQ(bits(tr2ang(&minus0, negzero)), bits(-0.0));  // atan2(-0, 1) is not below 0
+  const double down[6] = {0, -1, 1, 0, 0, 0}, nz[6] = {1, -0.0, 0, 1, 0, 0}, a0[2] = {0.0, -0.0};
+  EXPECT_EQ(bits(tr2ang(&a0[0], down)), bits(0x1.2d97c7f3321d2p+2));
+  EXPECT_EQ(bits(tr2ang(&a0[1], nz)), bits(-0.0));  // atan2(-0, 1) is not below 0
   // Only the parts asked for are written, and the flag says which were.
   const double l[6] = {1, 0, 1, 0, -1, 2.5};
   double out[8] = {9, 9, 9, 9, 9, 9};
-  std::int32_t flag = 1;
-  tr2ln(l, kRot2, out, &flag);
-  EXPECT_EQ(flag, 1);
-  expect_bits(out, {1, 3, 9, 9, 9, 9});
-  flag = 252;  // bits 4 and up are not parts: the parameters alone
-  tr2ln(l, kRot2, out, &flag);
-  EXPECT_EQ(flag, 4);
-  expect_bits(out, {1, 3, 9, 9, -2, 5});
+  for (std::int32_t ask : {1, 252}) {  // the point; then the parameters alone (bits 4 and up
+    std::int32_t flag = ask;            // are not parts)
+    tr2ln(l, kRot2, out, &flag);
+    EXPECT_EQ(flag, ask == 1 ? 1 : 4);
+    expect_bits(out, {1, 3, 9, 9, ask == 1 ? 9.0 : -2.0, ask == 1 ? 9.0 : 5.0});
+  }
   for (double bad : {-1.0, 1.5, kNaN, 3e9}) {  // a count that is not a whole number
     const double b[5] = {bad, 1, 0, 0, 1};
     tr2crv(b, kRot2, out);
