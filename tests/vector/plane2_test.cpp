@@ -2,7 +2,6 @@
 #include <gtest/gtest.h>
 
 #include <cmath>
-#include <limits>
 #include <vector>
 
 #include "support/real_checks.h"
@@ -11,7 +10,7 @@
 namespace {
 const double kPi = 3.141592653589793, kTwoPi = 6.283185307179586;
 const double kHalfPi = 0x1.921fb54442d18p+0;  // atan2(y > 0, +0), the rounded pi / 2
-const double kNaN = std::numeric_limits<double>::quiet_NaN();
+const double kNaN = std::nan("");
 // Rotation by 90 degrees scaled by 2, then (1, 1): (x, y) -> (1 - 2y, 1 + 2x), det 4.
 const double kRot2[6] = {0, 2, -2, 0, 1, 1};
 const double kFlipY[6] = {1, 0, 0, -1, 0, 0};  // (x, y) -> (x, -y), det -1
@@ -20,8 +19,7 @@ const double kOntoX[6] = {1, 0, 0, 0, 0, 0};  // projection onto the x axis, det
 }  // namespace
 
 TEST(Traele, EachTypeByHandAtItsTolerances) {
-  ToleranceGuard tol2(2, 0x1p-19), tol3(3, 0x1p-30), tol4(4, 0.5625), tol5(5, 0x1p-10);
-  ToleranceGuard tol12(12, 0.5);
+  ToleranceGuard g2(2, 0x1p-19), g3(3, 0x1p-30), g4(4, 0.5625), g5(5, 0x1p-10), g12(12, 0.5);
   const double e = 0x1p-53, below = 0x1.fffffffffffffp-11, s1 = 1 + 0x1p-11, s2 = 1 + 0x1p-10;
   const double tie[6] = {1, 0, 1, 0, e, 0}, half[6] = {std::nextafter(0.5, 1.0), 0, 0, 0.5};
   const double near1[6] = {s1, 0, 0, s1}, far1[6] = {s2, 0, 0, s2}, twice[6] = {2, 0, 0, 2};
