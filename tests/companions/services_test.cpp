@@ -1,0 +1,294 @@
+// tests/companions/services_test.cpp -- checks for companions/system: traceback, messages,
+// code texts, workspace addressing and accounting, copy, fill and sorts, guarded contexts, and
+// the growable tables.
+#include <gtest/gtest.h>
+
+#include <cmath>
+#include <cstring>
+#include <tuple>
+#include <utility>
+#include <vector>
+
+#include "companions/data/data_api.h"
+#include "support/real_checks.h"
+
+namespace {
+
+std::int32_t ierr = -1, zero = 0, one = 1, two = 2, three = 3;
+// A call's result with its ierr, which is then reset.
+std::pair<std::int32_t, std::int32_t> coded(std::int32_t result) {
+  return {result, std::exchange(ierr, 0)};
+}
+// Address of element `index` (from 1) of `size` bytes counted from base.
+std::uintptr_t at(const void* base, std::int64_t index, std::uintptr_t size) {
+  return reinterpret_cast<std::uintptr_t>(base) + static_cast<std::uintptr_t>(index - 1) * size;
+}
+// altes with index 77 and handle `held` on entry: (result, index, handle).
+std::tuple<std::int32_t, std::int64_t, std::int32_t> take(void* base, std::int32_t type,
+                                                          std::int32_t count, std::int32_t held) {
+  std::int64_t index = 77;
+  const std::int32_t result = altes(base, &type, &count, &index, &held);
+  return {result, index, held};
+}
+std::int32_t make_table(std::int32_t esize, std::int32_t entries) {
+  std::int32_t h = 0;
+  EXPECT_EQ(coded(yutini(&esize, &entries, &h, &ierr)), std::pair(0, 0));
+  return h;
+}
+void end_table(std::int32_t h) { EXPECT_EQ(coded(yutend(&h, &ierr)), std::pair(0, 0)); }
+// (entry size, entries) of a table.
+std::pair<std::int32_t, std::int32_t> info(std::int32_t h) {
+  std::int32_t esize = -1, entries = -1;
+  EXPECT_EQ(yutinf(&h, &esize, &entries, &ierr), 0);
+  return {esize, entries};
+}
+// Entries first.. of a table of reals (entry size a multiple of 8) from or into a vector.
+std::int32_t put(std::int32_t h, std::int32_t first, std::vector<double> v) {
+  std::int32_t count = static_cast<std::int32_t>(v.size() * 8) / info(h).first;
+  return yutwri(&h, &first, &count, v.data(), &ierr);
+}
+std::vector<double> get(std::int32_t h, std::int32_t first, std::int32_t count) {
+  std::vector<double> v(count * info(h).first / 8, -1.0);
+  EXPECT_EQ(yutrea(&h, &first, &count, v.data(), &ierr), 0);
+  return v;
+}
+// yuttab's index of a table's storage in units of the selector.
+std::int64_t storage(std::int32_t h, std::int32_t selector) {
+  std::int64_t index = 0;
+  std::int32_t entries = -1;
+  EXPECT_EQ(yuttab(&h, &selector, &index, &entries, &ierr), 0);
+  return index;
+}
+
+}  // namespace
+
+TEST(Bftier, KeepsNameBytesAndLengthAndOnlyTheMostRecentFrames) {
+  RecordedFrames rec;
+  const std::int32_t c1 = 4715, c2 = 250;
+  bftier(&c1, "YNF2PO   ", 9);
+  bftier(&c2, "XYZVOL;", 7);
+  bftier(&c1, "ignored tail", 0);
+  bftier(&c2, std::string(40, 'x').data(), 40);  // the first 32 bytes kept, the length as passed
+  EXPECT_EQ(rec.frames(), (std::vector<Frame>{{4715, "YNF2PO   ", 9},
+                                              {250, "XYZVOL;", 7},
+                                              {4715, "", 0},
+                                              {250, std::string(32, 'x'), 40}}));
+  orvq7sys_trace_clear();
+  for (std::int32_t i = 1; i <= ORVQ7SYS_TRACE_MAX + 5; ++i) bftier(&i, "ABC", 3);
+  EXPECT_EQ(orvq7sys_trace_count(), 64);
+  EXPECT_EQ(orvq7sys_trace_dropped(), 5);
+  EXPECT_EQ(rec.frames().front().code, 6);
+  EXPECT_EQ(rec.frames().back().code, 69);
+  // Frames outside 1..64 are refused before anything is written.
+  EXPECT_EQ(orvq7sys_trace_frame(0, nullptr, nullptr, nullptr), 1);
+  EXPECT_EQ(orvq7sys_trace_frame(65, nullptr, nullptr, nullptr), 1);
+}
+
+TEST(Errmsg, LogsCodeAndSeverityAndCodesHaveTexts) {
+  orvq7sys_msg_clear();
+  const std::int32_t code = 722;
+  errmsg(&code, &zero);
+  std::int32_t c = 0, s = -1;
+  EXPECT_EQ(orvq7sys_msg_count(), 1);
+  EXPECT_EQ(orvq7sys_msg_get(1, &c, &s), 0);
+  EXPECT_EQ(std::pair(c, s), std::pair(722, 0));
+  EXPECT_EQ(orvq7sys_msg_get(2, &c, &s), 1);
+  orvq7sys_msg_clear();
+  EXPECT_EQ(orvq7sys_msg_count(), 0);
+  // Texts for the 24 codes of the library (0, 1, 2, 36, 116, 250, 722, 1036, 4701 to 4704,
+  // 4707, 4709, 4710, 4712, 4713, 4715 to 4718, 4720 to 4722), "unknown code" for others.
+  std::int32_t known = 0;
+  for (std::int32_t code = -1; code <= 5000; ++code) {
+    known += std::strcmp(orvq7sys_code_text(code), "unknown code") != 0;
+  }
+  EXPECT_EQ(known, 24);
+}
+
+TEST(Altes, BlocksAreAddressedFromTheBaseInUnitsOfTheirType) {
+  WorkspaceWatch ws;
+  alignas(8) char area[16];
+  // From dynar (aligned) the block is aligned; from a base 3 bytes past alignment it lies a
+  // whole number of elements from that base.
+  const std::tuple<void*, int, std::uintptr_t> cases[] = {
+      {dynar, 2, 4}, {dynar, 3, 8}, {area + 3, 3, 8}};
+  for (auto [base, type, size] : cases) {
+    const auto [result, index, handle] = take(base, type, 37, 0);
+    ASSERT_EQ(result, 0);
+    EXPECT_NE(handle, 0);
+    EXPECT_EQ(ws.outstanding(), 1);
+    EXPECT_EQ(at(base, index, size) % size, base == dynar ? 0u : 3u);
+    std::memset(reinterpret_cast<void*>(at(base, index, size)), 0x5a, 37 * size);  // all ours
+    EXPECT_EQ(detes(&handle), 0);
+    EXPECT_EQ(ws.outstanding(), 0);
+  }
+  EXPECT_EQ(ws.requests(), 3);
+}
+
+TEST(Altes, RefusalsLeaveHandleAndIndexUnchanged) {
+  WorkspaceWatch ws;
+  // Two injected refusals, then types outside 1..4, a negative count, a caller that still
+  // holds a block.
+  ws.refuse_next(2);
+  const std::tuple<int, int, int> refused[] = {{3, 10, 0},  {3, 10, 0}, {0, 10, 0},    {5, 10, 0},
+                                               {-3, 10, 0}, {3, -1, 0}, {3, 10, 12345}};
+  for (auto [type, count, held] : refused) {
+    EXPECT_EQ(take(dynar, type, count, held), std::tuple(1, std::int64_t{77}, held));
+  }
+  EXPECT_EQ(ws.outstanding(), 0);
+  const auto [result, index, handle] = take(dynar, 3, 0, 0);  // granted again, an empty block
+  ASSERT_EQ(result, 0);
+  EXPECT_EQ(ws.outstanding(), 1);
+  // detes: the handle once, then refused; handle 0 is accepted, an unknown one refused.
+  const std::int32_t unknown = 987654;
+  EXPECT_EQ(detes(&handle), 0);
+  EXPECT_EQ(detes(&handle), 1);
+  EXPECT_EQ(detes(&zero), 0);
+  EXPECT_EQ(detes(&unknown), 1);
+  EXPECT_EQ(ws.outstanding(), 0);
+}
+
+TEST(CopyFillSort, CopyCountsBytesFillUsesTheLowByteSortsAreStable) {
+  double src[3] = {1.5, -2.25, 3.0}, dst[3] = {0, 0, 0};
+  std::int32_t n = 16, fill = 0x1ff;
+  crccop(src, &n, dst);
+  crccop(src, &zero, dst + 2);
+  expect_bits(dst, {1.5, -2.25, 0.0});
+  unsigned char bytes[4] = {9, 9, 9, 9};
+  crcmac(bytes, &three, &fill);
+  EXPECT_EQ(std::vector<int>(bytes, bytes + 4), (std::vector<int>{0xff, 0xff, 0xff, 9}));
+  std::int32_t table[] = {5, 1, 3, 0, 2, 3, 1, 2, 1, 4, 7, 5};  // 4 rows of 3, key 3
+  std::int32_t rows = 4, work[12];
+  for (std::int32_t key : {3, 4}) {  // key 4 is outside the rows: nothing moves
+    sori4(table, &three, &rows, &key, work);
+    EXPECT_EQ(std::vector<int>(table, table + 12),
+              (std::vector<int>{1, 2, 1, 5, 1, 3, 0, 2, 3, 4, 7, 5}));
+  }
+  double v[5] = {3.0, NAN, -1.0, 0.0, -0.0};
+  std::int32_t count = 5;
+  sorr8(v, &count);
+  expect_bits(v, {-1.0, 0.0, -0.0, 3.0, NAN});  // equal values keep their order, NaN last
+}
+
+TEST(Giufin, RecordsTheErrorHeldInGmacerOnlyForNonZeroStatus) {
+  RecordedFrames rec;
+  std::memcpy(gmacer, "GUMIN3  ", 8);
+  EXPECT_EQ(giuope(nullptr, nullptr, nullptr, nullptr), 0);
+  const std::int32_t singular = 104;
+  EXPECT_EQ(giufin(&zero, nullptr) & 1, 0);
+  EXPECT_TRUE(rec.empty());
+  EXPECT_EQ(giufin(&singular, nullptr) & 1, 1);
+  giuclo(&one);
+  EXPECT_EQ(rec.frames(), (std::vector<Frame>{{104, "GUMIN3  ", 8}}));
+}
+
+TEST(Tables, EntriesStartZeroWritesGrowShrinkKeepsCapacityRegrowthIsZeroFilled) {
+  const std::int64_t live0 = orvq7sys_table_live();
+  const std::int32_t h = make_table(16, 3);  // entries of two reals
+  EXPECT_EQ(orvq7sys_table_live(), live0 + 1);
+  EXPECT_EQ(info(h), std::pair(16, 3));
+  ASSERT_EQ(put(h, 3, {3.5, 3.25, 4.5, 4.25}), 0);  // entries 3 and 4: grows by one
+  EXPECT_EQ(info(h), std::pair(16, 4));
+  expect_bits(get(h, 2, 3).data(), {0.0, 0.0, 3.5, 3.25, 4.5, 4.25});
+  const std::int64_t cap = orvq7sys_table_capacity(h);
+  for (std::int32_t n : {1, 3}) ASSERT_EQ(yutmnc(&h, &n, &ierr), 0);
+  EXPECT_EQ(orvq7sys_table_capacity(h), cap);
+  expect_bits(get(h, 3, 1).data(), {0.0, 0.0});  // the old 3.5 and 3.25 are gone
+  end_table(h);
+  EXPECT_EQ(orvq7sys_table_live(), live0);
+}
+
+TEST(Tables, AppendingAMillionEntriesGrowsGeometrically) {
+  const std::int32_t h = make_table(8, 0);
+  constexpr std::int32_t kN = 1000000;
+  std::int32_t moves = 0;
+  std::int64_t cap = orvq7sys_table_capacity(h);
+  for (std::int32_t k = 1; k <= kN; ++k) {
+    // The path solver's pattern: extend by one, then write the new last entry.
+    const double v = 0.5 * k;
+    ASSERT_EQ(yutmnc(&h, &k, &ierr), 0);
+    ASSERT_EQ(yutwri(&h, &k, &one, &v, &ierr), 0);
+    moves += orvq7sys_table_capacity(h) != cap;
+    cap = orvq7sys_table_capacity(h);
+  }
+  // Doubling from 8 entries reaches 2^20 > 1e6 in 17 growths; never more than twice the need.
+  EXPECT_LE(moves, 20);
+  EXPECT_LT(cap, 2 * std::int64_t{kN});
+  // Direct access sees every entry, counted in reals from dynar.
+  const auto* d = reinterpret_cast<const double*>(at(dynar, storage(h, 3), 8));
+  std::int32_t bad = 0;
+  for (std::int32_t k = 1; k <= kN; ++k) bad += d[k - 1] != 0.5 * k;
+  EXPECT_EQ(bad, 0);
+  end_table(h);
+}
+
+TEST(Tables, YuttabCountsInUnitsOfTheSelectorAndYutcopIsIndependent) {
+  const std::int32_t h = make_table(8, 0);
+  std::int32_t copy = 0;
+  ASSERT_EQ(put(h, 1, {2.25, -7.125}), 0);
+  const std::uintptr_t first = at(dynar, storage(h, 1), 1);
+  EXPECT_EQ(first % 16, 0u);
+  for (std::int32_t sel : {2, 3, 4})
+    EXPECT_EQ(at(dynar, storage(h, sel), std::uintptr_t{1} << sel), first);
+  EXPECT_EQ(reinterpret_cast<const double*>(first)[1], -7.125);
+  ASSERT_EQ(yutcop(&h, &copy, &ierr), 0);
+  EXPECT_NE(copy, h);
+  ASSERT_EQ(put(h, 1, {9.0}), 0);
+  end_table(h);
+  EXPECT_EQ(info(copy), std::pair(8, 2));
+  expect_bits(get(copy, 1, 2).data(), {2.25, -7.125});
+  end_table(copy);
+}
+
+// Every refused call: code 4712, nothing written, the table unchanged.
+TEST(Tables, BadArgumentsAreRefusedWithoutChange) {
+  const std::int64_t live0 = orvq7sys_table_live();
+  const std::int32_t h = make_table(4, 2), dead = make_table(4, 1), four = 4, five = 5, minus = -1;
+  end_table(dead);
+  std::int32_t buf[4] = {7, 7, 7, 7}, out = -9, out2 = -9, k = 0;
+  std::int64_t index = -9;
+  for (auto refused :
+       {coded(yutini(&zero, &one, &out, &ierr)),   // entry size 0
+        coded(yutini(&one, &minus, &out, &ierr)),  // negative count
+        coded(yutwri(&dead, &one, &one, buf, &ierr)), coded(yutwri(&h, &zero, &one, buf, &ierr)),
+        coded(yutwri(&h, &four, &one, buf, &ierr)),  // would leave entry 3 unwritten
+        coded(yutwri(&h, &one, &minus, buf, &ierr)),
+        coded(yutrea(&h, &two, &two, buf, &ierr)),  // entry 3 does not exist
+        coded(yutrea(&dead, &one, &one, buf, &ierr)), coded(yutinf(&dead, &out, &out2, &ierr)),
+        coded(yutmnc(&h, &minus, &ierr)), coded(yutmnc(&dead, &one, &ierr)),
+        coded(yuttab(&h, &zero, &index, &out, &ierr)),  // selectors 1..4 only
+        coded(yuttab(&h, &five, &index, &out, &ierr)),
+        coded(yuttab(&dead, &three, &index, &out, &ierr)), coded(yutcop(&dead, &out, &ierr)),
+        coded(yutend(&dead, &ierr)), coded(yutend(&zero, &ierr))}) {
+    EXPECT_EQ(refused, std::pair(1, 4712)) << "call " << ++k;
+  }
+  EXPECT_EQ(std::tuple(out, out2, index, buf[0]), std::tuple(-9, -9, std::int64_t{-9}, 7));
+  EXPECT_EQ(info(h), std::pair(4, 2));
+  // Reads and writes of zero entries at the end are fine.
+  EXPECT_EQ(yutrea(&h, &three, &zero, buf, &ierr), 0);
+  EXPECT_EQ(yutwri(&h, &three, &zero, buf, &ierr), 0);
+  end_table(h);
+  EXPECT_EQ(orvq7sys_table_live(), live0);
+}
+
+TEST(Tables, InjectedRefusalsGiveCode36AndChangeNothing) {
+  const std::int64_t live0 = orvq7sys_table_live_thread();
+  const std::int32_t h = make_table(8, 1);
+  std::int32_t out = -9;
+  orvq7sys_table_refuse(0, 4);
+  for (auto refused : {coded(yutini(&one, &one, &out, &ierr)), coded(put(h, 1, {3.0})),
+                       coded(yutmnc(&h, &two, &ierr)), coded(yutcop(&h, &out, &ierr))}) {
+    EXPECT_EQ(refused, std::pair(1, 36));
+  }
+  EXPECT_EQ(out, -9);
+  // The injection is used up: reads never count, the next write succeeds.
+  EXPECT_EQ(info(h), std::pair(8, 1));
+  expect_bits(get(h, 1, 1).data(), {0.0});
+  EXPECT_EQ(put(h, 1, {3.0}), 0);
+  // Skipping: the next call goes through, the one after is refused.
+  orvq7sys_table_refuse(1, 1);
+  EXPECT_EQ(coded(yutmnc(&h, &two, &ierr)), std::pair(0, 0));
+  EXPECT_EQ(coded(yutmnc(&h, &one, &ierr)), std::pair(1, 36));
+  EXPECT_EQ(coded(yutmnc(&h, &one, &ierr)), std::pair(0, 0));
+  end_table(h);
+  EXPECT_EQ(orvq7sys_table_live_thread(), live0);
+}
