@@ -1,7 +1,8 @@
-// tests/path/driver_thread_test.cpp -- two paths traced by ynchem at once, on two threads.
+// tests/path/driver_thread_test.cpp -- paths traced by ynchem on several threads at once.
 #include <gtest/gtest.h>
 
 #include <cstdint>
+#include <cstring>
 #include <thread>
 #include <vector>
 
@@ -9,38 +10,47 @@
 
 namespace {
 
-// The points and tangents of the circle (n = 2) or of Viviani's curve (n = 3), K = 4.
-std::vector<unsigned char> trace(std::int32_t n) {
-  Curve c(n == 2 ? Curve::kCircle : Curve::kViviani, n);
-  const double xd2[4] = {1, 0, 0, 1}, xd3[6] = {0, 0, 2, 0, 1, 0}, tol = 0.01, eps = 1e-20;
-  double box[6], pas[6];
-  for (std::int32_t i = 0; i < n; ++i)
-    box[i] = -3, box[n + i] = 3, pas[i] = 1e-4, pas[n + i] = 0.25;
-  const std::int32_t mode = 4, store = 2 + 8;
-  std::int32_t itab = 0, ierr = -1, count = 0;
-  if (ynchem(&c, &n, eval_curve, &eps, n == 2 ? xd2 : xd3, box, pas, &mode, &tol, &store, &itab,
-             &ierr) != 0) {
-    return {};
-  }
-  auto points = read_kind(itab, 23, &count);
-  yncend(&itab, &ierr);
-  return points;
+struct Traced {
+  Curve curve;
+  Path path;
+};
+
+// The circle (K = 4), Viviani's curve (K = 4), a circle of radius^2 2 keeping phases and
+// numbers (K = 8, the step bound of this thread), and the sphere with the plane (K = 2).
+std::vector<Traced> paths() {
+  std::vector<Traced> v;
+  v.push_back({Curve(Curve::kCircle, 2), Path{{1, 0}, {0, 1}}});
+  v.push_back({Curve(Curve::kViviani, 3), Path{{0, 0, 2}, {0, 1, 0}}});
+  v.push_back({Curve(Curve::kCircle, 2, 2.0), Path{{1, 1}, {-1, 1}}});
+  v.push_back({Curve(Curve::kSpherePlane, 3), Path{{1, 0, 0}, {0, 1, 0}}});
+  v[2].path.mode = 8, v[2].path.store = 2 + 16, v[3].path.mode = 2;
+  return v;
 }
 
-TEST(YnchemThreads, TwoPathsAtOnceMatchTheirSequentialRuns) {
-  const auto circle = trace(2), viviani = trace(3);
-  ASSERT_FALSE(circle.empty() || viviani.empty());
+TEST(YnchemThreads, PathsAtOnceMatchTheirSequentialRuns) {
+  std::vector<Traced> want = paths();
+  for (Traced& t : want) {
+    run_path(t.curve, t.path);
+    ASSERT_EQ(t.path.result, 0);
+    ASSERT_GT(t.path.count, 20);
+  }
   const std::int64_t live0 = orvq7sys_table_live();
-  int mismatches[2] = {0, 0};
-  auto rounds = [&](std::int32_t n, const std::vector<unsigned char>& want, int* bad) {
-    for (int k = 0; k < 10; ++k) *bad += trace(n) != want;
-  };
-  std::thread a(rounds, 2, std::cref(circle), &mismatches[0]);
-  std::thread b(rounds, 3, std::cref(viviani), &mismatches[1]);
-  a.join();
-  b.join();
-  EXPECT_EQ(mismatches[0], 0);
-  EXPECT_EQ(mismatches[1], 0);
+  std::vector<int> mismatches(want.size(), 0);
+  std::vector<std::thread> pool;
+  for (std::size_t k = 0; k < want.size(); ++k) {
+    pool.emplace_back([&, k] {
+      for (int round = 0; round < 8; ++round) {
+        Traced t = paths()[k];
+        run_path(t.curve, t.path);
+        const Path &got = t.path, &w = want[k].path;
+        mismatches[k] += got.ierr != 0 || got.xt.size() != w.xt.size() ||
+                         std::memcmp(got.xt.data(), w.xt.data(), 8 * w.xt.size()) != 0 ||
+                         got.number != w.number || got.phase != w.phase;
+      }
+    });
+  }
+  for (auto& t : pool) t.join();
+  for (std::size_t k = 0; k < want.size(); ++k) EXPECT_EQ(mismatches[k], 0) << "path " << k;
   EXPECT_EQ(orvq7sys_table_live(), live0);
 }
 

@@ -9,37 +9,38 @@
 
 namespace {
 
+// Step bounds (0.01, 0.2) and tolerances 0.1 for up to four unknowns (kPas2 for two).
+const double kPas[8] = {0.01, 0.01, 0.01, 0.01, 0.2, 0.2, 0.2, 0.2};
+const double kTol[4] = {0.1, 0.1, 0.1, 0.1};
+const double* const kPas2 = kPas + 2;
+
 struct Decoded {
   Orvq7PathOptions options{};
   double limits[2] = {-1.0, -1.0};
   Orvq7PathLayout layout{};
   std::int32_t pairs[22] = {};
-  std::int32_t ierr = -1;
-  std::int32_t result = -1;
+  std::int32_t ierr = -1, result = -1;
 };
 
 Decoded decode(std::int32_t n, std::int32_t mode, std::int32_t store, std::int32_t variant,
-               const double* tol, const double* pas) {
+               const double* tol = kTol, const double* pas = kPas) {
   Decoded d;
-  d.result = wnccmd(&n, pas, &mode, tol, &store, &variant, &d.options, d.limits, &d.layout, d.pairs,
-                    &d.ierr);
+  d.result = wnccmd(&n, pas, &mode, tol, &store, &variant, &d.options, d.limits, &d.layout,
+                    d.pairs, &d.ierr);
   return d;
 }
 
-// Step bounds (0.01, 0.2) and tolerances 0.1 for up to four unknowns.
-const double kPas[8] = {0.01, 0.01, 0.01, 0.01, 0.2, 0.2, 0.2, 0.2};
-const double kTol[4] = {0.1, 0.1, 0.1, 0.1};
-
 struct WordCase {
-  std::int32_t mode, store, variant, ierr, kind, order;
+  std::int32_t mode, store, variant, ierr, kind = 0, order = 0, n = 4;
+  const double* tol = kTol;
+  const double* pas = kPas;
 };
 
 class OptionWords : public ::testing::TestWithParam<WordCase> {};
 
 TEST_P(OptionWords, AreAcceptedOrRefusedAsTabled) {
   const WordCase& w = GetParam();
-  // Unknowns in pas and tol are laid out for n = 4: pas(i,2) starts at element 4.
-  const Decoded d = decode(4, w.mode, w.store, w.variant, kTol, kPas);
+  const Decoded d = decode(w.n, w.mode, w.store, w.variant, w.tol, w.pas);
   EXPECT_EQ(d.ierr, w.ierr);
   EXPECT_EQ(d.result, w.ierr == 0 ? 0 : 1);
   if (w.ierr == 0) {
@@ -49,54 +50,47 @@ TEST_P(OptionWords, AreAcceptedOrRefusedAsTabled) {
 }
 
 constexpr std::int32_t kB15 = 1 << 15, kB16 = 1 << 16, kB29 = 1 << 29;
-INSTANTIATE_TEST_SUITE_P(
-    Wnccmd, OptionWords,
-    ::testing::Values(
-        WordCase{4, 2, 1, 0, 4, 1}, WordCase{4, 3, 1, 4718, 0, 0},   // store bit 0 refused
-        WordCase{2, 2, 1, 0, 2, 0}, WordCase{8, 2 + 8, 1, 0, 8, 1},  // first group allowed
-        WordCase{4 + kB15, 2, 1, 0, 4, 2},                           // order level 2
-        WordCase{2 + kB15, 2, 1, 4718, 0, 0},                        // bit 15 needs K = 4, 8
-        WordCase{8 + kB16, 2, 1, 4718, 0, 0}, WordCase{8 + kB16, 2, 2, 4718, 0, 0},
-        WordCase{4 + kB16, 2, 1, 0, 4, 1},                             // per-unknown with K = 4
-        WordCase{1, 2, 1, 4718, 0, 0}, WordCase{1, 2, 2, 0, 1, 0},     // K = 1: extremum only
-        WordCase{0, 2, 1, 4718, 0, 0}, WordCase{0, 2, 2, 4718, 0, 0},  // no kind
-        WordCase{3, 2, 2, 4718, 0, 0},                                 // two kind bits
-        WordCase{16, 2, 2, 4718, 0, 0}, WordCase{4 + 16384, 2, 1, 4718, 0, 0},  // bits 4, 14
-        WordCase{4 + (1 << 20), 2, 1, 4718, 0, 0},
-        WordCase{static_cast<std::int32_t>(0x80000004u), 2, 1, 4718, 0, 0},  // bit 31
-        WordCase{4, 2 + kB29, 1, 4718, 0, 0}, WordCase{1, 8 + kB29, 2, 4718, 0, 0},
-        WordCase{4, 2 + kB15, 1, 4718, 0, 0}, WordCase{4, 0, 1, 4718, 0, 0},
-        WordCase{4, 64 + 1024, 2, 4718, 0, 0},                            // no pair
-        WordCase{4, static_cast<std::int32_t>(0x80000042u), 1, 0, 4, 1},  // ignored bits 6 and 31
-        WordCase{4, 2 + 128, 1, 4718, 0, 0}, WordCase{2, 2 + 128, 2, 0, 2, 1},  // 2nd group
-        WordCase{4, 2, 3, 4718, 0, 0}, WordCase{4, 2, 0, 4718, 0, 0}));
+const double kBadPas[4] = {0.3, 0.01, 0.2, 0.2};    // pas(1,1) > pas(1,2)
+const double kEqualPas[4] = {0.1, 0.01, 0.1, 0.2};  // pas(1,1) = pas(1,2): strict
+const double kBadTol[2] = {0.0, 0.1}, kTolPair[2] = {0.1, 0.2}, kTolNan[2] = {0.1, NAN};
 
-TEST(Wnccmd, ChecksRunInTheirOrder) {
-  const double bad_pas[4] = {0.3, 0.01, 0.2, 0.2};  // pas(1,1) > pas(1,2)
-  const double bad_tol[2] = {0.0, 0.1};
-  EXPECT_EQ(decode(1, 4, 2, 1, kTol, kPas).ierr, 4712);
-  EXPECT_EQ(decode(21, 4, 2, 1, kTol, kPas).ierr, 4718);
-  EXPECT_EQ(decode(2, 3, 0, 1, kTol, bad_pas).ierr, 4712);      // step bounds before the words
-  EXPECT_EQ(decode(2, 3, 0, 1, bad_tol, kPas + 2).ierr, 4718);  // mode before tol
-  EXPECT_EQ(decode(2, 4, 0, 1, bad_tol, kPas + 2).ierr, 4712);  // tol before store
-  // Per-unknown tolerances: every one must be positive.
-  const double tol_pair[2] = {0.1, 0.2};
-  EXPECT_EQ(decode(2, 4 + kB16, 2, 1, tol_pair, kPas + 2).ierr, 0);
-  const double tol_nan[2] = {0.1, std::nan("")};
-  EXPECT_EQ(decode(2, 4 + kB16, 2, 1, tol_nan, kPas + 2).ierr, 4712);
-  const double pas_equal[4] = {0.1, 0.01, 0.1, 0.2};  // pas(1,1) = pas(1,2): strict
-  EXPECT_EQ(decode(2, 4, 2, 1, kTol, pas_equal).ierr, 4712);
-}
+// clang-format off
+INSTANTIATE_TEST_SUITE_P(Wnccmd, OptionWords, ::testing::Values(
+    WordCase{4, 2, 1, 0, 4, 1}, WordCase{4, 3, 1, 4718},           // store bit 0 refused
+    WordCase{2, 2, 1, 0, 2, 0}, WordCase{8, 2 + 8, 1, 0, 8, 1},    // first group allowed
+    WordCase{4 + kB15, 2, 1, 0, 4, 2}, WordCase{2 + kB15, 2, 1, 4718},  // level 2 needs K 4, 8
+    WordCase{8 + kB16, 2, 1, 4718}, WordCase{8 + kB16, 2, 2, 4718},
+    WordCase{4 + kB16, 2, 1, 0, 4, 1},                             // per-unknown with K = 4
+    WordCase{1, 2, 1, 4718}, WordCase{1, 2, 2, 0, 1, 0},           // K = 1: extremum only
+    WordCase{0, 2, 1, 4718}, WordCase{0, 2, 2, 4718}, WordCase{3, 2, 2, 4718},  // 0, 2 kinds
+    WordCase{16, 2, 2, 4718}, WordCase{4 + 16384, 2, 1, 4718},     // bits 4, 14
+    WordCase{4 + (1 << 20), 2, 1, 4718}, WordCase{int(0x80000004u), 2, 1, 4718},  // 20, 31
+    WordCase{4, 2 + kB29, 1, 4718}, WordCase{1, 8 + kB29, 2, 4718},
+    WordCase{4, 2 + kB15, 1, 4718}, WordCase{4, 0, 1, 4718},
+    WordCase{4, 64 + 1024, 2, 4718},                               // no pair
+    WordCase{4, int(0x80000042u), 1, 0, 4, 1},                     // ignored bits 6 and 31
+    WordCase{4, 2 + 128, 1, 4718}, WordCase{2, 2 + 128, 2, 0, 2, 1},  // second group
+    WordCase{4, 2, 3, 4718}, WordCase{4, 2, 0, 4718},
+    // The checks in their order: n, step bounds, the words, tol, store.
+    WordCase{4, 2, 1, 4712, 0, 0, 1}, WordCase{4, 2, 1, 4718, 0, 0, 21},
+    WordCase{3, 0, 1, 4712, 0, 0, 2, kTol, kBadPas},
+    WordCase{4, 2, 1, 4712, 0, 0, 2, kTol, kEqualPas},
+    WordCase{3, 0, 1, 4718, 0, 0, 2, kBadTol, kPas2},
+    WordCase{4, 0, 1, 4712, 0, 0, 2, kBadTol, kPas2},
+    // Per-unknown tolerances: every one must be positive.
+    WordCase{4 + kB16, 2, 1, 0, 4, 1, 2, kTolPair, kPas2},
+    WordCase{4 + kB16, 2, 1, 4712, 0, 0, 2, kTolNan, kPas2}));
+// clang-format on
 
 TEST(Wnccmd, DerivedLimits) {
   // K = 8: cosine limit 1/sqrt(1.01) for tol 0.1; 0.92388 for tol 1 (1/sqrt(2) is smaller).
   // B = 1/h with h = pas(1,2) = 0.2.
-  Decoded d = decode(2, 8, 2, 1, kTol, kPas + 2);
+  Decoded d = decode(2, 8, 2, 1, kTol, kPas2);
   ASSERT_EQ(d.ierr, 0);
   EXPECT_EQ(bits(d.limits[1]), bits(0x1.fd7583bc82e2ap-1));  // 0.995037...
   EXPECT_EQ(bits(d.limits[0]), bits(5.0));
   const double tol1[1] = {1.0};
-  EXPECT_EQ(bits(decode(2, 8, 2, 1, tol1, kPas + 2).limits[1]), bits(0.92388));
+  EXPECT_EQ(bits(decode(2, 8, 2, 1, tol1, kPas2).limits[1]), bits(0.92388));
   // K = 4 with per-unknown tolerance: h is the smallest pas(i,2); B = 1/h^2 = 1/(0.125^2).
   const double pas[6] = {0.01, 0.01, 0.01, 0.5, 0.125, 0.25};
   d = decode(3, 4 + kB16, 2, 1, kTol, pas);
@@ -104,7 +98,7 @@ TEST(Wnccmd, DerivedLimits) {
   EXPECT_EQ(bits(d.limits[0]), bits(64.0));
   EXPECT_EQ(bits(d.limits[1]), bits(0.92388));
   // K = 2: B is left as it was.
-  EXPECT_EQ(bits(decode(2, 2, 2, 1, kTol, kPas + 2).limits[0]), bits(-1.0));
+  EXPECT_EQ(bits(decode(2, 2, 2, 1, kTol, kPas2).limits[0]), bits(-1.0));
 }
 
 TEST(Wnccmd, StorageRequestBecomesPairsAndSlots) {
@@ -121,9 +115,7 @@ TEST(Wnccmd, StorageRequestBecomesPairsAndSlots) {
   const std::int32_t want_offset[9] = {0, 0, 6, 12, 13, 14, 0, 0, 0};
   for (int s = 0; s < 9; ++s) {
     EXPECT_EQ(d.layout.slot[s].width, want_width[s]) << s;
-    if (d.layout.slot[s].used) {
-      EXPECT_EQ(d.layout.slot[s].offset, want_offset[s]) << s;
-    }
+    EXPECT_EQ(d.layout.slot[s].offset, want_offset[s]) << s;  // 0 when unused
   }
   EXPECT_EQ(d.layout.nvalues, 17);
   EXPECT_EQ(d.options.flag18, 1);
@@ -132,7 +124,7 @@ TEST(Wnccmd, StorageRequestBecomesPairsAndSlots) {
 TEST(Wnccex, FirstFormKeepsOnlyTheRequestedMembersAndAdjustsOptions) {
   // Extremum path, K = 2, store bits 0, 3 (first group, first form) and 9 (second group).
   // mode bit 17 and 19 are recorded; flag 18 becomes 2; the second group raises the order.
-  const Decoded d = decode(2, 2 + (1 << 17) + (1 << 19), 1 + 8 + 512, 2, kTol, kPas + 2);
+  const Decoded d = decode(2, 2 + (1 << 17) + (1 << 19), 1 + 8 + 512, 2, kTol, kPas2);
   ASSERT_EQ(d.ierr, 0);
   EXPECT_EQ(d.options.flag17, 1);
   EXPECT_EQ(d.options.flag19, 1);
@@ -142,7 +134,7 @@ TEST(Wnccex, FirstFormKeepsOnlyTheRequestedMembersAndAdjustsOptions) {
   for (int s = 0; s < 9; ++s) EXPECT_EQ(d.layout.slot[s].width, want_width[s]) << s;
   EXPECT_EQ(d.layout.nused, 7);
   // Bit 18 set: no turn test, so flag 18 stays 0; bit 30: the first group's second form.
-  const Decoded e = decode(2, 2 + (1 << 18), 8 + (1 << 30), 2, kTol, kPas + 2);
+  const Decoded e = decode(2, 2 + (1 << 18), 8 + (1 << 30), 2, kTol, kPas2);
   ASSERT_EQ(e.ierr, 0);
   EXPECT_EQ(e.options.flag18, 0);
   EXPECT_EQ(e.layout.slot[4].width, 1);
