@@ -1,38 +1,26 @@
 // tests/path/driver_thread_test.cpp -- paths traced by ynchem on several threads at once.
-#include <gtest/gtest.h>
-
-#include <cstdint>
-#include <cstring>
 #include <thread>
-#include <vector>
 
 #include "curves.h"
 
 namespace {
 
-struct Traced {
-  Curve curve;
-  Path path;
-};
-
-// The circle (K = 4), Viviani's curve (K = 4), a circle of radius^2 2 keeping phases and
-// numbers (K = 8, the step bound of this thread), and the sphere with the plane (K = 2).
-std::vector<Traced> paths() {
-  std::vector<Traced> v;
-  v.push_back({Curve(Curve::kCircle, 2), Path{{1, 0}, {0, 1}}});
-  v.push_back({Curve(Curve::kViviani, 3), Path{{0, 0, 2}, {0, 1, 0}}});
-  v.push_back({Curve(Curve::kCircle, 2, 2.0), Path{{1, 1}, {-1, 1}}});
-  v.push_back({Curve(Curve::kSpherePlane, 3), Path{{1, 0, 0}, {0, 1, 0}}});
-  v[2].path.mode = 8, v[2].path.store = 2 + 16, v[3].path.mode = 2;
+// The circle and Viviani's curve (K = 4), a circle of radius^2 2 keeping phases and numbers
+// (K = 8), the sphere with the plane (K = 2).
+std::vector<Path> paths() {
+  std::vector<Path> v{{Curve(Curve::kCircle, 2), {1, 0}, {0, 1}},
+                      {Curve(Curve::kViviani, 3), {0, 0, 2}, {0, 1, 0}},
+                      {Curve(Curve::kCircle, 2, 2.0), {1, 1}, {-1, 1}, {3.0}, 1e-4, 0.01, 8, 18},
+                      {Curve(Curve::kSpherePlane, 3), {1, 0, 0}, {0, 1, 0}, {3.0}, 1e-4, 0.01, 2}};
   return v;
 }
 
 TEST(YnchemThreads, PathsAtOnceMatchTheirSequentialRuns) {
-  std::vector<Traced> want = paths();
-  for (Traced& t : want) {
-    run_path(t.curve, t.path);
-    ASSERT_EQ(t.path.result, 0);
-    ASSERT_GT(t.path.count, 20);
+  std::vector<Path> want = paths();
+  for (Path& p : want) {
+    p.run();
+    ASSERT_EQ(p.result, 0);
+    ASSERT_GT(p.count, 20);
   }
   const std::int64_t live0 = orvq7sys_table_live();
   std::vector<int> mismatches(want.size(), 0);
@@ -40,12 +28,10 @@ TEST(YnchemThreads, PathsAtOnceMatchTheirSequentialRuns) {
   for (std::size_t k = 0; k < want.size(); ++k) {
     pool.emplace_back([&, k] {
       for (int round = 0; round < 8; ++round) {
-        Traced t = paths()[k];
-        run_path(t.curve, t.path);
-        const Path &got = t.path, &w = want[k].path;
-        mismatches[k] += got.ierr != 0 || got.xt.size() != w.xt.size() ||
-                         std::memcmp(got.xt.data(), w.xt.data(), 8 * w.xt.size()) != 0 ||
-                         got.number != w.number || got.phase != w.phase;
+        Path p = paths()[k];
+        p.run();
+        mismatches[k] += p.ierr != 0 || bitsv(p.xt) != bitsv(want[k].xt) ||
+                         p.number != want[k].number || p.phase != want[k].phase;
       }
     });
   }

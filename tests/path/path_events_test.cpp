@@ -1,40 +1,12 @@
 // tests/path/path_events_test.cpp -- checks for path/path_events.cpp: wnctop, wnctes
 // (with wnctob and the quadratic model), wnccar, wncver.
-#include <gtest/gtest.h>
-
-#include <cmath>
-#include <cstdint>
-#include <vector>
-
 #include "curves.h"
 
 namespace {
 
-TEST(Wnctop, KeepsTheFaceCrossedFirstAndLandsOnIt) {
-  // From the origin in the box [-1, 1]^2. Ratios 2 (x) and 3 (y): y's lower face first, with
-  // lambda = fl(1/3) and x = 2 fl(1/3); equal ratios keep x; an end on the face is kept.
-  struct Case {
-    double xb[2];
-    std::int32_t result, face[2];
-    double xout[2];
-  };
-  const Case cases[] = {{{2.0, 0.5}, 0, {2, 1}, {1.0, 0.25}},
-                        {{2.0, -3.0}, 0, {1, 2}, {0x1.5555555555555p-1, -1.0}},
-                        {{2.0, 2.0}, 0, {2, 1}, {1.0, 1.0}},
-                        {{0.375, 1.0}, 0, {2, 2}, {0.375, 1.0}},
-                        {{0.5, NAN}, 1, {-7, -7}, {-2.5, -2.5}}};  // none outside: 4712
-  const std::int32_t n = 2;
-  const double xa[2] = {0.0, 0.0}, box[4] = {-1.0, -1.0, 1.0, 1.0};
-  for (const Case& k : cases) {
-    std::int32_t face[2] = {-7, -7}, ierr = -1;
-    double xout[2] = {-2.5, -2.5};
-    ASSERT_EQ(wnctop(&n, xa, k.xb, box, face, xout, &ierr), k.result) << k.xb[0];
-    EXPECT_EQ(ierr, k.result == 0 ? 0 : 4712);
-    EXPECT_EQ(face[0], k.face[0]);
-    EXPECT_EQ(face[1], k.face[1]);
-    for (int i = 0; i < 2; ++i) EXPECT_EQ(bits(xout[i]), bits(k.xout[i])) << k.xb[0];
-  }
-}
+const double kXd[4] = {1.0, 0.0, 0.0, 1.0};  // x0 = (1, 0), d0 = (0, 1)
+const double kEps = 1e-20;
+const std::int32_t kN = 2;
 
 // A march record at `angle` on the unit circle, moving counter-clockwise.
 Orvq7PathMarch on_circle(double angle, std::int32_t nstored) {
@@ -42,14 +14,35 @@ Orvq7PathMarch on_circle(double angle, std::int32_t nstored) {
   m.x[0] = std::cos(angle), m.x[1] = std::sin(angle);
   m.t[0] = m.tprev[0] = -m.x[1], m.t[1] = m.tprev[1] = m.x[0];
   m.h = m.hprev = 0.25, m.f = m.g = 1.0;
-  m.nstored = nstored;
-  m.treq = 2;
+  m.nstored = nstored, m.treq = 2;
   return m;
 }
 
-const double kXd[4] = {1.0, 0.0, 0.0, 1.0};  // x0 = (1, 0), d0 = (0, 1)
-const double kEps = 1e-20;
-const std::int32_t kN = 2;
+TEST(Wnctop, KeepsTheFaceCrossedFirstAndLandsOnIt) {
+  // From the origin in the box [-1, 1]^2. Ratios 2 (x) and 3 (y): y's lower face first, with
+  // lambda = fl(1/3) and x = 2 fl(1/3); equal ratios keep x; an end on the face is kept.
+  struct Case {
+    std::vector<double> xb;
+    std::int32_t result;
+    std::vector<std::int32_t> face;
+    std::vector<double> xout;
+  };
+  const Case cases[] = {{{2.0, 0.5}, 0, {2, 1}, {1.0, 0.25}},
+                        {{2.0, -3.0}, 0, {1, 2}, {0x1.5555555555555p-1, -1.0}},
+                        {{2.0, 2.0}, 0, {2, 1}, {1.0, 1.0}},
+                        {{0.375, 1.0}, 0, {2, 2}, {0.375, 1.0}},
+                        {{0.5, NAN}, 1, {-7, -7}, {-2.5, -2.5}}};  // none outside: 4712
+  const double xa[2] = {0.0, 0.0}, box[4] = {-1.0, -1.0, 1.0, 1.0};
+  for (const Case& k : cases) {
+    std::vector<std::int32_t> face = {-7, -7};
+    std::int32_t ierr = -1;
+    double xout[2] = {-2.5, -2.5};
+    EXPECT_EQ(wnctop(&kN, xa, k.xb.data(), box, face.data(), xout, &ierr), k.result);
+    EXPECT_EQ(ierr, k.result == 0 ? 0 : 4712);
+    EXPECT_EQ(face, k.face);
+    EXPECT_EQ(bitsv(xout, 2), bitsv(k.xout)) << k.xb[0];
+  }
+}
 
 TEST(Wnctes, CurveLeavingAndReturningWithinTheStepEndsOnTheFace) {
   // From angle -0.3 to 0.3 in the box x <= 0.99: both points inside (x = 0.955), the arc
@@ -73,53 +66,45 @@ TEST(Wnctes, CurveLeavingAndReturningWithinTheStepEndsOnTheFace) {
   }
 }
 
-struct CarCase {
-  const char* what;
-  double angle;  // the point kept, on the unit circle; the current point is (1, 0)
-  std::int32_t mode, special, nstored;
-  double pas_lo, pas_hi;
-  std::int32_t redo, accepted;
-};
-
-class Acceptance : public ::testing::TestWithParam<CarCase> {};
-
-TEST_P(Acceptance, RedoesWithThreeQuartersOfTheFactorOrClassifiesThePoint) {
-  const CarCase& k = GetParam();
-  SCOPED_TRACE(k.what);
-  PathRecords r(2, k.mode, 2);
-  Curve c(Curve::kCircle, 2);
-  Orvq7PathMarch m = on_circle(0.0, k.nstored);
-  const double keep[2] = {std::cos(k.angle), std::sin(k.angle)};
-  const double pas[4] = {k.pas_lo, k.pas_lo, k.pas_hi, k.pas_hi};
-  std::int32_t special = k.special, redo = -1, accepted = -1, ierr = -1;
-  ASSERT_EQ(wnccar(&c, &kN, eval_curve, kXd, keep, pas, &r.options, r.limits, r.tol, &special, &m,
-                   &redo, &accepted, &ierr),
-            0);
-  EXPECT_EQ(redo, k.redo);
-  EXPECT_EQ(bits(m.f), bits(k.redo != 0 ? 0.75 : 1.0));
-  EXPECT_EQ(special, k.redo != 0 ? 0 : k.special);
-  if (k.redo == 0) {
+TEST(Wnccar, RedoesWithThreeQuartersOfTheFactorOrClassifiesThePoint) {
+  const double k30 = 30.0 * 3.14159265358979323846 / 180.0;
+  struct Case {
+    double angle;  // the point kept, on the unit circle; the current point is (1, 0)
+    std::int32_t mode, special, nstored;
+    double pas_lo, pas_hi;
+    std::int32_t redo, accepted;
+  };
+  const Case cases[] = {
+      // A 30 degree turn: cos 30 = 0.866 < 0.92388; accepted with mode bit 18, unless the
+      // step is beyond a maximum step.
+      {k30, 2, 0, 3, 1e-3, 1.0, 1, 1},
+      {k30, 2 + 262144, 0, 3, 1e-3, 1.0, 0, 1},
+      {k30, 2 + 262144, 1, 3, 1e-3, 0.3, 1, 1},
+      // An end point within the minimum steps replaces the last point of a longer path.
+      {0.005, 2, 1, 2, 0.01, 1.0, 0, 2},
+      {0.05, 2, 1, 2, 0.01, 1.0, 0, 1},
+      {0.05, 2, 2, 9, 0.01, 1.0, 0, 1}};  // closed: back to x0 with d0
+  for (const Case& k : cases) {
+    SCOPED_TRACE(testing::Message() << k.angle << " " << k.special << " " << k.pas_hi);
+    PathRecords r(2, k.mode, 2);
+    Curve c(Curve::kCircle, 2);
+    Orvq7PathMarch m = on_circle(0.0, k.nstored);
+    const double keep[2] = {std::cos(k.angle), std::sin(k.angle)};
+    const double pas[4] = {k.pas_lo, k.pas_lo, k.pas_hi, k.pas_hi};
+    std::int32_t special = k.special, redo = -1, accepted = -1, ierr = -1;
+    ASSERT_EQ(wnccar(&c, &kN, eval_curve, kXd, keep, pas, &r.options, r.limits, r.tol, &special,
+                     &m, &redo, &accepted, &ierr),
+              0);
+    EXPECT_EQ(redo, k.redo);
+    EXPECT_EQ(bits(m.f), bits(k.redo != 0 ? 0.75 : 1.0));
+    EXPECT_EQ(special, k.redo != 0 ? 0 : k.special);
     EXPECT_EQ(accepted, k.accepted);
+    // Advanced to the point kept (x0 when closed), with its tangent, unless redone.
+    const bool stays = k.redo != 0 || k.special == 2;
+    EXPECT_EQ(bits(m.x[0]), bits(stays ? 1.0 : keep[0]));
+    EXPECT_NEAR(m.t[0], stays ? 0.0 : -keep[1], 1e-15);
   }
-  // Advanced to the point kept (x0 when closed), with its tangent, unless redone.
-  const bool stays = k.redo != 0 || k.special == 2;
-  EXPECT_EQ(bits(m.x[0]), bits(stays ? 1.0 : keep[0]));
-  EXPECT_NEAR(m.t[0], stays ? 0.0 : -keep[1], 1e-15);
 }
-
-const double k30 = 30.0 * 3.14159265358979323846 / 180.0;
-
-INSTANTIATE_TEST_SUITE_P(
-    Wnccar, Acceptance,
-    ::testing::Values(
-        // A 30 degree turn: cos 30 = 0.866 < 0.92388; accepted with mode bit 18.
-        CarCase{"turn", k30, 2, 0, 3, 1e-3, 1.0, 1, 0},
-        CarCase{"turn, bit 18", k30, 2 + 262144, 0, 3, 1e-3, 1.0, 0, 1},
-        CarCase{"beyond a maximum step", k30, 2 + 262144, 1, 3, 1e-3, 0.3, 1, 0},
-        // An end point within the minimum steps replaces the last point of a longer path.
-        CarCase{"end point near", 0.005, 2, 1, 2, 0.01, 1.0, 0, 2},
-        CarCase{"end point beyond", 0.05, 2, 1, 2, 0.01, 1.0, 0, 1},
-        CarCase{"closed: back to x0 with d0", 0.05, 2, 2, 9, 0.01, 1.0, 0, 1}));
 
 TEST(Wncver, TurnTestIsStrictAndTheChordTestScalesByTheTolerance) {
   const double limits[2] = {0.0, 0.92388}, tol[1] = {0.5}, tight[1] = {0.4};
