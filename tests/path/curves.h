@@ -32,19 +32,18 @@ struct Curve {
   }
   // The sum of squared residuals at y, in long double (apart from the routines' rounding).
   long double residual2(const double* y) const {
-    long double s = 0;
-    for (int k = 0; k < n - 1; ++k) {
-      long double f = -c[k];
+    long double s = 0, f = 0;
+    for (int k = 0; k < n - 1; s += f * f, ++k) {
+      f = -c[k];
       for (int i = 0; i < n; ++i) f += (a[k][i] * static_cast<long double>(y[i]) + b[k][i]) * y[i];
-      s += f * f;
     }
     return s;
   }
   std::int32_t n;
   double a[20][21] = {}, b[20][21] = {}, c[20] = {};  // room for a refused n = 21
   std::int32_t fail_code = 0;
-  std::size_t fail_after = 0, poison_after = ~std::size_t{0};
   double poison = 0.0;
+  std::size_t fail_after = 0, poison_after = ~std::size_t{0};
   std::vector<std::int32_t> reqs{}, npts{};
 };
 
@@ -78,6 +77,9 @@ inline std::int32_t eval_curve(void* ctx, const std::int32_t* npts, const double
   return 0;
 }
 
+using Ints = std::vector<std::int32_t>;
+using Reals = std::vector<double>;
+
 inline std::vector<std::uint64_t> bitsv(const double* v, std::size_t n) {
   std::vector<std::uint64_t> u(n);
   std::transform(v, v + n, u.begin(), bits);
@@ -97,14 +99,12 @@ struct PathRecords {
   std::int32_t flush(std::int32_t phase, std::int32_t accepted) {
     return wncflu(&phase, &accepted, &options, &layout, &march, &tables, &itab, &ierr);
   }
-  std::int32_t dim;
+  std::int32_t dim, pairs[22] = {}, itab = 0, ierr = -1, result = -1;
   double pas[40] = {}, tol[20] = {}, limits[2] = {};
   Orvq7PathOptions options{};
   Orvq7PathLayout layout{};
-  std::int32_t pairs[22] = {};
   Orvq7PathMarch march{};
   Orvq7PathTables tables{};
-  std::int32_t itab = 0, ierr = -1, result = -1;
 };
 
 // The values of the quantity of a record kind in a result (an integer quantity read as
@@ -127,8 +127,7 @@ struct Path {
   Curve c;
   std::vector<double> x0, d0, half = {3.0};
   double lo = 1e-4, tol = 0.01;
-  std::int32_t mode = 4, store = 2 + 8;
-  std::int32_t result = -1, ierr = -1, itab = -1, count = 0;
+  std::int32_t mode = 4, store = 2 + 8, result = -1, ierr = -1, itab = -1, count = 0;
   std::vector<double> xt{};
   std::vector<std::int32_t> phase{}, number{};
   const double* x(std::int32_t j) const { return xt.data() + 2 * c.n * j; }

@@ -14,10 +14,10 @@ struct Decoded {
   Orvq7PathLayout layout{};
   std::int32_t pairs[22] = {};
   std::int32_t ierr = -1, result = -1;
-  std::vector<std::int32_t> widths() const {
-    std::vector<std::int32_t> w;
-    for (const Orvq7PathSlot& s : layout.slot) w.push_back(s.width);
-    return w;
+  Ints slots(std::int32_t Orvq7PathSlot::*field) const {
+    Ints v;
+    for (const Orvq7PathSlot& s : layout.slot) v.push_back(s.*field);
+    return v;
   }
 };
 
@@ -36,8 +36,7 @@ TEST(Wnccmd, OptionWordsAreAcceptedOrRefusedAsTabled) {
   const double bad_tol[2] = {0.0, 0.1}, tol_pair[2] = {0.1, 0.2}, tol_nan[2] = {0.1, NAN};
   struct Case {
     std::int32_t mode, store, variant, ierr, kind = 0, order = 0, n = 4;
-    const double* tol = kTol;
-    const double* pas = kPas;
+    const double *tol = kTol, *pas = kPas;
   };
   // clang-format off
   const Case cases[] = {
@@ -60,11 +59,9 @@ TEST(Wnccmd, OptionWordsAreAcceptedOrRefusedAsTabled) {
   for (const Case& w : cases) {
     const Decoded d = decode(w.n, w.mode, w.store, w.variant, w.tol, w.pas);
     SCOPED_TRACE(testing::Message() << w.mode << " " << w.store << " " << w.variant);
-    EXPECT_EQ(d.ierr, w.ierr);
-    EXPECT_EQ(d.result, w.ierr == 0 ? 0 : 1);
+    EXPECT_EQ((Ints{d.ierr, d.result}), (Ints{w.ierr, w.ierr == 0 ? 0 : 1}));
     if (w.ierr != 0) continue;
-    EXPECT_EQ(d.options.kind, w.kind);
-    EXPECT_EQ(d.options.order, w.order);
+    EXPECT_EQ((Ints{d.options.kind, d.options.order}), (Ints{w.kind, w.order}));
   }
 }
 
@@ -86,16 +83,12 @@ TEST(Wnccmd, StorageRequestBecomesPairsAndSlots) {
   const double pas[6] = {0.01, 0.01, 0.01, 0.2, 0.2, 0.2};
   const Decoded d = decode(3, 4, 2 + 4 + 16, 1, kTol, pas);
   ASSERT_EQ(d.ierr, 0);
-  std::vector<std::int32_t> pairs = {6, 23, 6, 43, 0, 1, 0, 2, 0, 3};
+  Ints pairs = {6, 23, 6, 43, 0, 1, 0, 2, 0, 3};
   pairs.resize(22);
-  EXPECT_EQ(std::vector<std::int32_t>(d.pairs, d.pairs + 22), pairs);
-  EXPECT_EQ(d.layout.nused, 5);
-  EXPECT_EQ(d.layout.form1, 2);
-  EXPECT_EQ(d.widths(), (std::vector<std::int32_t>{0, 6, 6, 1, 1, 3, 0, 0, 0, 0, 0}));
-  std::vector<std::int32_t> offsets;  // 0 when unused
-  for (const Orvq7PathSlot& s : d.layout.slot) offsets.push_back(s.offset);
-  EXPECT_EQ(offsets, (std::vector<std::int32_t>{0, 0, 6, 12, 13, 14, 0, 0, 0, 0, 0}));
-  EXPECT_EQ(d.layout.nvalues, 17);
+  EXPECT_EQ(Ints(d.pairs, d.pairs + 22), pairs);
+  EXPECT_EQ((Ints{d.layout.nused, d.layout.form1, d.layout.nvalues}), (Ints{5, 2, 17}));
+  EXPECT_EQ(d.slots(&Orvq7PathSlot::width), (Ints{0, 6, 6, 1, 1, 3, 0, 0, 0, 0, 0}));
+  EXPECT_EQ(d.slots(&Orvq7PathSlot::offset), (Ints{0, 0, 6, 12, 13, 14, 0, 0, 0, 0, 0}));
   EXPECT_EQ(d.options.flag18, 1);
 }
 
@@ -105,15 +98,14 @@ TEST(Wnccex, FirstFormKeepsOnlyTheRequestedMembersAndAdjustsOptions) {
   const Decoded d = decode(2, 2 + (1 << 17) + (1 << 19), 1 + 8 + 512, 2, kTol, kPas2);
   ASSERT_EQ(d.ierr, 0);
   const Orvq7PathOptions& o = d.options;
-  EXPECT_EQ((std::vector<std::int32_t>{o.flag17, o.flag18, o.flag19, o.order}),
-            (std::vector<std::int32_t>{1, 2, 1, 1}));
-  EXPECT_EQ(d.widths(), (std::vector<std::int32_t>{2, 0, 0, 1, 0, 0, 0, 0, 2, 0, 0}));
+  EXPECT_EQ((Ints{o.flag17, o.flag18, o.flag19, o.order}), (Ints{1, 2, 1, 1}));
+  EXPECT_EQ(d.slots(&Orvq7PathSlot::width), (Ints{2, 0, 0, 1, 0, 0, 0, 0, 2, 0, 0}));
   EXPECT_EQ(d.layout.nused, 7);
   // Bit 18 set: no turn test, so flag 18 stays 0; bit 30: the first group's second form.
   const Decoded e = decode(2, 2 + (1 << 18), 8 + (1 << 30), 2, kTol, kPas2);
   ASSERT_EQ(e.ierr, 0);
   EXPECT_EQ(e.options.flag18, 0);
-  EXPECT_EQ(e.widths(), (std::vector<std::int32_t>{0, 0, 0, 1, 1, 2, 0, 0, 0, 0, 0}));
+  EXPECT_EQ(e.slots(&Orvq7PathSlot::width), (Ints{0, 0, 0, 1, 1, 2, 0, 0, 0, 0, 0}));
 }
 
 }  // namespace

@@ -21,12 +21,7 @@ Orvq7PathMarch on_circle(double angle, std::int32_t nstored) {
 TEST(Wnctop, KeepsTheFaceCrossedFirstAndLandsOnIt) {
   // From the origin in the box [-1, 1]^2. Ratios 2 (x) and 3 (y): y's lower face first, with
   // lambda = fl(1/3) and x = 2 fl(1/3); equal ratios keep x; an end on the face is kept.
-  struct Case {
-    std::vector<double> xb;
-    std::int32_t result;
-    std::vector<std::int32_t> face;
-    std::vector<double> xout;
-  };
+  struct Case { Reals xb; std::int32_t result; Ints face; Reals xout; };
   const Case cases[] = {{{2.0, 0.5}, 0, {2, 1}, {1.0, 0.25}},
                         {{2.0, -3.0}, 0, {1, 2}, {0x1.5555555555555p-1, -1.0}},
                         {{2.0, 2.0}, 0, {2, 1}, {1.0, 1.0}},
@@ -34,7 +29,7 @@ TEST(Wnctop, KeepsTheFaceCrossedFirstAndLandsOnIt) {
                         {{0.5, NAN}, 1, {-7, -7}, {-2.5, -2.5}}};  // none outside: 4712
   const double xa[2] = {0.0, 0.0}, box[4] = {-1.0, -1.0, 1.0, 1.0};
   for (const Case& k : cases) {
-    std::vector<std::int32_t> face = {-7, -7};
+    Ints face = {-7, -7};
     std::int32_t ierr = -1;
     double xout[2] = {-2.5, -2.5};
     EXPECT_EQ(wnctop(&kN, xa, k.xb.data(), box, face.data(), xout, &ierr), k.result);
@@ -58,50 +53,42 @@ TEST(Wnctes, CurveLeavingAndReturningWithinTheStepEndsOnTheFace) {
     ASSERT_EQ(wnctes(&c, &kN, eval_curve, &kEps, kXd, xnew, box, pas, &m, &redo, keep, &special,
                      &ierr),
               0);
-    EXPECT_EQ(redo, 0);
-    EXPECT_EQ(special, nstored == 1 ? 0 : 1);
-    EXPECT_EQ(bits(m.f), bits(1.0));
-    EXPECT_EQ(bits(keep[0]), bits(nstored == 1 ? xnew[0] : 0.99));
+    EXPECT_EQ((Ints{redo, special}), (Ints{0, nstored == 1 ? 0 : 1}));
+    EXPECT_EQ(bitsv({m.f, keep[0]}), bitsv({1.0, nstored == 1 ? xnew[0] : 0.99}));
     EXPECT_NEAR(keep[1], nstored == 1 ? xnew[1] : -std::sqrt(1 - 0.99 * 0.99), 1e-10);
   }
 }
 
 TEST(Wnccar, RedoesWithThreeQuartersOfTheFactorOrClassifiesThePoint) {
   const double k30 = 30.0 * 3.14159265358979323846 / 180.0;
-  struct Case {
-    double angle;  // the point kept, on the unit circle; the current point is (1, 0)
-    std::int32_t mode, special, nstored;
-    double pas_lo, pas_hi;
-    std::int32_t redo, accepted;
-  };
+  // The point kept at `angle` on the unit circle; the current point is (1, 0).
+  struct Case { double angle; std::int32_t mode, special, nstored; double lo, hi; Ints want; };
   const Case cases[] = {
       // A 30 degree turn: cos 30 = 0.866 < 0.92388; accepted with mode bit 18, unless the
-      // step is beyond a maximum step.
-      {k30, 2, 0, 3, 1e-3, 1.0, 1, 1},
-      {k30, 2 + 262144, 0, 3, 1e-3, 1.0, 0, 1},
-      {k30, 2 + 262144, 1, 3, 1e-3, 0.3, 1, 1},
+      // step is beyond a maximum step. want = (redo, accepted, special).
+      {k30, 2, 0, 3, 1e-3, 1.0, {1, 1, 0}},
+      {k30, 2 + 262144, 0, 3, 1e-3, 1.0, {0, 1, 0}},
+      {k30, 2 + 262144, 1, 3, 1e-3, 0.3, {1, 1, 0}},
       // An end point within the minimum steps replaces the last point of a longer path.
-      {0.005, 2, 1, 2, 0.01, 1.0, 0, 2},
-      {0.05, 2, 1, 2, 0.01, 1.0, 0, 1},
-      {0.05, 2, 2, 9, 0.01, 1.0, 0, 1}};  // closed: back to x0 with d0
+      {0.005, 2, 1, 2, 0.01, 1.0, {0, 2, 1}},
+      {0.05, 2, 1, 2, 0.01, 1.0, {0, 1, 1}},
+      {0.05, 2, 2, 9, 0.01, 1.0, {0, 1, 2}}};  // closed: back to x0 with d0
   for (const Case& k : cases) {
-    SCOPED_TRACE(testing::Message() << k.angle << " " << k.special << " " << k.pas_hi);
+    SCOPED_TRACE(testing::Message() << k.angle << " " << k.special << " " << k.hi);
     PathRecords r(2, k.mode, 2);
     Curve c(Curve::kCircle, 2);
     Orvq7PathMarch m = on_circle(0.0, k.nstored);
     const double keep[2] = {std::cos(k.angle), std::sin(k.angle)};
-    const double pas[4] = {k.pas_lo, k.pas_lo, k.pas_hi, k.pas_hi};
+    const double pas[4] = {k.lo, k.lo, k.hi, k.hi};
     std::int32_t special = k.special, redo = -1, accepted = -1, ierr = -1;
     ASSERT_EQ(wnccar(&c, &kN, eval_curve, kXd, keep, pas, &r.options, r.limits, r.tol, &special,
                      &m, &redo, &accepted, &ierr),
               0);
-    EXPECT_EQ(redo, k.redo);
-    EXPECT_EQ(bits(m.f), bits(k.redo != 0 ? 0.75 : 1.0));
-    EXPECT_EQ(special, k.redo != 0 ? 0 : k.special);
-    EXPECT_EQ(accepted, k.accepted);
-    // Advanced to the point kept (x0 when closed), with its tangent, unless redone.
-    const bool stays = k.redo != 0 || k.special == 2;
-    EXPECT_EQ(bits(m.x[0]), bits(stays ? 1.0 : keep[0]));
+    EXPECT_EQ((Ints{redo, accepted, special}), k.want);
+    // A redo takes 0.75 of the step factor; else advanced to the point kept (x0 when closed),
+    // with its tangent.
+    const bool stays = k.want[0] != 0 || k.special == 2;
+    EXPECT_EQ(bitsv({m.f, m.x[0]}), bitsv({k.want[0] != 0 ? 0.75 : 1.0, stays ? 1.0 : keep[0]}));
     EXPECT_NEAR(m.t[0], stays ? 0.0 : -keep[1], 1e-15);
   }
 }
@@ -114,11 +101,7 @@ TEST(Wncver, TurnTestIsStrictAndTheChordTestScalesByTheTolerance) {
   const double back[2] = {-1.0, 0.0}, chord[2] = {0.6, 0.8}, reversed[2] = {-0.6, -0.8};
   // K = 4 without turn test: L / 8 = 0.5 and t - tnew = (0.4, -0.8) (also for the reversed
   // tangent): sum (0.5 d_i / tol)^2 is 0.8 for tol 0.5, 1.25 for 0.4.
-  struct Case {
-    std::int32_t kind, flag18;
-    const double *tnew, *tol;
-    std::int32_t redo;
-  };
+  struct Case { std::int32_t kind, flag18; const double *tnew, *tol; std::int32_t redo; };
   const Case cases[] = {{2, 1, at, tol, 0},      {2, 1, below, tol, 1},     {2, 1, back, tol, 0},
                         {2, 2, back, tol, 1},    {2, 0, below, tol, 0},     {4, 0, chord, tol, 0},
                         {4, 0, chord, tight, 2}, {4, 0, reversed, tight, 2}};
