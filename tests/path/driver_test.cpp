@@ -5,8 +5,8 @@
 
 namespace {
 
-std::vector<double> axis(std::int32_t n, std::int32_t i, double len = 1.0) {
-  std::vector<double> v(n, 0.0);
+Reals axis(std::int32_t n, std::int32_t i, double len = 1.0) {
+  Reals v(n, 0.0);
   v[i] = len;
   return v;
 }
@@ -27,8 +27,7 @@ std::vector<Frame> trace(Path& r) {
 // 0, 1, ..., 1, last_phase.
 void expect_sound(const Path& r, std::int32_t last_phase) {
   const std::int32_t n = r.c.n;
-  ASSERT_EQ(r.xt.size(), static_cast<std::size_t>(2 * n * r.count));
-  ASSERT_EQ(r.phase.size(), static_cast<std::size_t>(r.count));
+  ASSERT_EQ((Ints{int(r.xt.size()), int(r.phase.size())}), (Ints{2 * n * r.count, r.count}));
   for (std::int32_t j = 0; j < r.count; ++j) {
     EXPECT_LE(r.c.residual2(r.x(j)), 1e-20) << j + 1;
     EXPECT_EQ(r.number[j], j + 1);
@@ -92,9 +91,9 @@ TEST(Ynchem, FailuresLeaveNoTableAndTheirFrames) {
   // d0 = (dx, dy, 0...) from x0 = (1, 0, ...) in the box |x_i| <= 1; the names of the frames,
   // all with code ierr.
   struct Case {
-    std::int32_t n, mode, store;
+    int n, mode, store;
     double dx, dy, lo;
-    std::int32_t fail_code, fail_after, ierr;
+    int fail, after, ierr;
     std::vector<const char*> frames;
   };
   const Case cases[] = {
@@ -110,12 +109,12 @@ TEST(Ynchem, FailuresLeaveNoTableAndTheirFrames) {
       {2, 4, 10, 0, 1, 1e-4, 4715, 1, 4718, {"YNCHEM  "}}};  // 4715 for the tangent
   for (const Case& k : cases) {
     Path r{Curve(Curve::kCircle, k.n), axis(k.n, 0), axis(k.n, 0, k.dx), {1.0}, k.lo};
-    r.c.fail_code = k.fail_code, r.c.fail_after = k.fail_after;
+    r.c.fail_code = k.fail, r.c.fail_after = k.after;
     r.d0[1] = k.dy, r.mode = k.mode, r.store = k.store;
     std::vector<Frame> want;
     for (const char* name : k.frames) want.push_back({k.ierr, name, std::int32_t(strlen(name))});
     EXPECT_EQ(trace(r), want) << k.ierr;
-    EXPECT_EQ((std::vector<std::int32_t>{r.result, r.ierr, r.itab}), (std::vector{1, k.ierr, 0}));
+    EXPECT_EQ((Ints{r.result, r.ierr, r.itab}), (Ints{1, k.ierr, 0}));
   }
 }
 
@@ -138,12 +137,12 @@ TEST(Ynchem, WithoutRecordKind2TheLookupQuirkDecides) {
     // Kind 23 only: returned with 4712 and yncrea's frame.
     Path r{Curve(Curve::kCircle, 2), {1, 0}, {0, 1}, {3.0}, 1e-4, 0.01, 4, 2};
     EXPECT_EQ(trace(r), (std::vector<Frame>{{4712, " YNCREA ", 8}}));
-    EXPECT_EQ((std::vector{r.result, r.ierr}), (std::vector{0, 4712}));
+    EXPECT_EQ((Ints{r.result, r.ierr}), (Ints{0, 4712}));
     EXPECT_GT(r.count, 20);
     Path collapse{Curve(Curve::kCircle, 2), {1, 0}, {0, 1}, {3.0}, 0.2};
     trace(collapse);  // one point: leaves the count 1 behind
     trace(r);         // the whole circle again, now released as a single point
-    EXPECT_EQ((std::vector{r.result, r.ierr}), (std::vector{1, 4721}));
+    EXPECT_EQ((Ints{r.result, r.ierr}), (Ints{1, 4721}));
   }).join();
 }
 
