@@ -12,6 +12,9 @@
 #include "path/path_state.h"
 #include "support/recording_services.h"
 
+using Ints = std::vector<std::int32_t>;
+using Reals = std::vector<double>;
+
 // n - 1 equations F_k(x) = sum over i of (a_ki x_i + b_ki) x_i - c_k, and what the solver
 // asked of them. Calls from number fail_after on fail with fail_code (when non-zero); calls
 // from number poison_after on write `poison` into every value.
@@ -42,9 +45,9 @@ struct Curve {
   std::int32_t n;
   double a[20][21] = {}, b[20][21] = {}, c[20] = {};  // room for a refused n = 21
   std::int32_t fail_code = 0;
-  double poison = 0.0;
   std::size_t fail_after = 0, poison_after = ~std::size_t{0};
-  std::vector<std::int32_t> reqs{}, npts{};
+  double poison = 0.0;
+  Ints reqs{}, npts{};
 };
 
 // Six-argument evaluation routine over a Curve context.
@@ -73,19 +76,15 @@ inline std::int32_t eval_curve(void* ctx, const std::int32_t* npts, const double
     }
     if (call >= c.poison_after) std::fill(f, out, c.poison);
   }
-  *ierr = 0;
-  return 0;
+  return *ierr = 0;
 }
-
-using Ints = std::vector<std::int32_t>;
-using Reals = std::vector<double>;
 
 inline std::vector<std::uint64_t> bitsv(const double* v, std::size_t n) {
   std::vector<std::uint64_t> u(n);
   std::transform(v, v + n, u.begin(), bits);
   return u;
 }
-inline std::vector<std::uint64_t> bitsv(std::vector<double> v) { return bitsv(v.data(), v.size()); }
+inline std::vector<std::uint64_t> bitsv(Reals v) { return bitsv(v.data(), v.size()); }
 
 // The records of one path, decoded by wnccmd for n unknowns with step bounds (0.001, 0.25)
 // and tolerance 0.01.
@@ -125,16 +124,16 @@ std::vector<T> read_kind(std::int32_t itab, std::int32_t kind, std::int32_t* cou
 // when stored), read back before the result is released.
 struct Path {
   Curve c;
-  std::vector<double> x0, d0, half = {3.0};
+  Reals x0, d0, half = {3.0};
   double lo = 1e-4, tol = 0.01;
   std::int32_t mode = 4, store = 2 + 8, result = -1, ierr = -1, itab = -1, count = 0;
-  std::vector<double> xt{};
-  std::vector<std::int32_t> phase{}, number{};
+  Reals xt{};
+  Ints phase{}, number{};
   const double* x(std::int32_t j) const { return xt.data() + 2 * c.n * j; }
 
   void run() {
     const std::int32_t n = c.n;
-    std::vector<double> xd = x0, box(2 * n), pas(2 * n), tols(n, 0.01);
+    Reals xd = x0, box(2 * n), pas(2 * n), tols(n, 0.01);
     xd.insert(xd.end(), d0.begin(), d0.end());
     for (std::int32_t i = 0; i < n; ++i) {
       const double h = half[std::min<std::size_t>(i, half.size() - 1)];

@@ -6,16 +6,14 @@
 namespace {
 
 // The circle and Viviani's curve (K = 4), a circle of radius^2 2 keeping phases and numbers
-// (K = 8), the sphere with the plane (K = 2).
-std::vector<Path> paths() {
-  return {{Curve(Curve::kCircle, 2), {1, 0}, {0, 1}},
-          {Curve(Curve::kViviani, 3), {0, 0, 2}, {0, 1, 0}},
-          {Curve(Curve::kCircle, 2, 2.0), {1, 1}, {-1, 1}, {3.0}, 1e-4, 0.01, 8, 2 + 16},
-          {Curve(Curve::kSpherePlane, 3), {1, 0, 0}, {0, 1, 0}, {3.0}, 1e-4, 0.01, 2}};
-}
-
+// (K = 8), the sphere with the plane (K = 2), each traced again and again on its own thread.
 TEST(YnchemThreads, PathsAtOnceMatchTheirSequentialRuns) {
-  std::vector<Path> want = paths();
+  const std::vector<Path> paths = {
+      {Curve(Curve::kCircle, 2), {1, 0}, {0, 1}},
+      {Curve(Curve::kViviani, 3), {0, 0, 2}, {0, 1, 0}},
+      {Curve(Curve::kCircle, 2, 2.0), {1, 1}, {-1, 1}, {3.0}, 1e-4, 0.01, 8, 2 + 16},
+      {Curve(Curve::kSpherePlane, 3), {1, 0, 0}, {0, 1, 0}, {3.0}, 1e-4, 0.01, 2}};
+  std::vector<Path> want = paths;
   for (Path& p : want) {
     p.run();
     ASSERT_GT(p.count, 20);
@@ -26,7 +24,7 @@ TEST(YnchemThreads, PathsAtOnceMatchTheirSequentialRuns) {
   for (std::size_t k = 0; k < want.size(); ++k) {
     pool.emplace_back([&, k] {
       for (int round = 0; round < 8; ++round) {
-        Path p = paths()[k];
+        Path p = paths[k];
         p.run();
         mismatches[k] += p.ierr != 0 || bitsv(p.xt) != bitsv(want[k].xt) ||
                          p.number != want[k].number || p.phase != want[k].phase;

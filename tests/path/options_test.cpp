@@ -9,25 +9,20 @@ const double kTol[4] = {0.1, 0.1, 0.1, 0.1};
 const double* const kPas2 = kPas + 2;
 
 struct Decoded {
-  Orvq7PathOptions options{};
-  double limits[2] = {-1.0, -1.0};
-  Orvq7PathLayout layout{};
-  std::int32_t pairs[22] = {};
-  std::int32_t ierr = -1, result = -1;
+  Decoded(std::int32_t n, std::int32_t mode, std::int32_t store, std::int32_t variant,
+          const double* tol = kTol, const double* pas = kPas) {
+    result = wnccmd(&n, pas, &mode, tol, &store, &variant, &options, limits, &layout, pairs, &ierr);
+  }
   Ints slots(std::int32_t Orvq7PathSlot::*field) const {
     Ints v;
     for (const Orvq7PathSlot& s : layout.slot) v.push_back(s.*field);
     return v;
   }
+  Orvq7PathOptions options{};
+  Orvq7PathLayout layout{};
+  double limits[2] = {-1.0, -1.0};
+  std::int32_t pairs[22] = {}, ierr = -1, result = -1;
 };
-
-Decoded decode(std::int32_t n, std::int32_t mode, std::int32_t store, std::int32_t variant,
-               const double* tol = kTol, const double* pas = kPas) {
-  Decoded d;
-  d.result = wnccmd(&n, pas, &mode, tol, &store, &variant, &d.options, d.limits, &d.layout,
-                    d.pairs, &d.ierr);
-  return d;
-}
 
 TEST(Wnccmd, OptionWordsAreAcceptedOrRefusedAsTabled) {
   constexpr std::int32_t kB15 = 1 << 15, kB16 = 1 << 16, kB29 = 1 << 29;
@@ -57,7 +52,7 @@ TEST(Wnccmd, OptionWordsAreAcceptedOrRefusedAsTabled) {
       {4 + kB16, 2, 1, 4712, 0, 0, 2, tol_nan, kPas2}};
   // clang-format on
   for (const Case& w : cases) {
-    const Decoded d = decode(w.n, w.mode, w.store, w.variant, w.tol, w.pas);
+    const Decoded d(w.n, w.mode, w.store, w.variant, w.tol, w.pas);
     SCOPED_TRACE(testing::Message() << w.mode << " " << w.store << " " << w.variant);
     EXPECT_EQ((Ints{d.ierr, d.result}), (Ints{w.ierr, w.ierr == 0 ? 0 : 1}));
     if (w.ierr != 0) continue;
@@ -69,19 +64,19 @@ TEST(Wnccmd, DerivedLimits) {
   // K = 8: cosine limit 1/sqrt(1.01) for tol 0.1; 0.92388 for tol 1 (1/sqrt(2) is smaller).
   // B = 1/h with h = pas(1,2) = 0.2.
   const double tol1[1] = {1.0}, pas[6] = {0.01, 0.01, 0.01, 0.5, 0.125, 0.25};
-  EXPECT_EQ(bitsv(decode(2, 8, 2, 1, kTol, kPas2).limits, 2), bitsv({5.0, 0x1.fd7583bc82e2ap-1}));
-  EXPECT_EQ(bits(decode(2, 8, 2, 1, tol1, kPas2).limits[1]), bits(0.92388));
+  EXPECT_EQ(bitsv(Decoded(2, 8, 2, 1, kTol, kPas2).limits, 2), bitsv({5.0, 0x1.fd7583bc82e2ap-1}));
+  EXPECT_EQ(bits(Decoded(2, 8, 2, 1, tol1, kPas2).limits[1]), bits(0.92388));
   // K = 4 with per-unknown tolerance: h is the smallest pas(i,2); B = 1/h^2 = 1/(0.125^2).
-  EXPECT_EQ(bitsv(decode(3, 4 + (1 << 16), 2, 1, kTol, pas).limits, 2), bitsv({64.0, 0.92388}));
+  EXPECT_EQ(bitsv(Decoded(3, 4 + (1 << 16), 2, 1, kTol, pas).limits, 2), bitsv({64.0, 0.92388}));
   // K = 2: B is left as it was.
-  EXPECT_EQ(bits(decode(2, 2, 2, 1, kTol, kPas2).limits[0]), bits(-1.0));
+  EXPECT_EQ(bits(Decoded(2, 2, 2, 1, kTol, kPas2).limits[0]), bits(-1.0));
 }
 
 TEST(Wnccmd, StorageRequestBecomesPairsAndSlots) {
   // Implicit path, n = 3, store bits 1, 2 and 4 (one member of the first group): the first
   // group is forced into its second form, so all three members get values.
   const double pas[6] = {0.01, 0.01, 0.01, 0.2, 0.2, 0.2};
-  const Decoded d = decode(3, 4, 2 + 4 + 16, 1, kTol, pas);
+  const Decoded d(3, 4, 2 + 4 + 16, 1, kTol, pas);
   ASSERT_EQ(d.ierr, 0);
   Ints pairs = {6, 23, 6, 43, 0, 1, 0, 2, 0, 3};
   pairs.resize(22);
@@ -95,14 +90,14 @@ TEST(Wnccmd, StorageRequestBecomesPairsAndSlots) {
 TEST(Wnccex, FirstFormKeepsOnlyTheRequestedMembersAndAdjustsOptions) {
   // Extremum path, K = 2, store bits 0, 3 (first group, first form) and 9 (second group).
   // mode bit 17 and 19 are recorded; flag 18 becomes 2; the second group raises the order.
-  const Decoded d = decode(2, 2 + (1 << 17) + (1 << 19), 1 + 8 + 512, 2, kTol, kPas2);
+  const Decoded d(2, 2 + (1 << 17) + (1 << 19), 1 + 8 + 512, 2, kTol, kPas2);
   ASSERT_EQ(d.ierr, 0);
   const Orvq7PathOptions& o = d.options;
   EXPECT_EQ((Ints{o.flag17, o.flag18, o.flag19, o.order}), (Ints{1, 2, 1, 1}));
   EXPECT_EQ(d.slots(&Orvq7PathSlot::width), (Ints{2, 0, 0, 1, 0, 0, 0, 0, 2, 0, 0}));
   EXPECT_EQ(d.layout.nused, 7);
   // Bit 18 set: no turn test, so flag 18 stays 0; bit 30: the first group's second form.
-  const Decoded e = decode(2, 2 + (1 << 18), 8 + (1 << 30), 2, kTol, kPas2);
+  const Decoded e(2, 2 + (1 << 18), 8 + (1 << 30), 2, kTol, kPas2);
   ASSERT_EQ(e.ierr, 0);
   EXPECT_EQ(e.options.flag18, 0);
   EXPECT_EQ(e.slots(&Orvq7PathSlot::width), (Ints{0, 0, 0, 1, 1, 2, 0, 0, 0, 0, 0}));
