@@ -3,8 +3,6 @@
 
 #include "curves.h"
 
-namespace {
-
 Reals axis(std::int32_t n, std::int32_t i, double len = 1.0) {
   Reals v(n, 0.0);
   v[i] = len;
@@ -38,83 +36,82 @@ void expect_sound(const Path& r, std::int32_t last_phase) {
   }
 }
 
+const Reals e1 = {1, 0}, e2 = {0, 1};
+
 TEST(Ynchem, PathsEndExactlyOnTheirStartPointOrOnTheFaceTheyLeave) {
-  struct Case { Curve::Kind kind; std::int32_t n, mode; std::vector<std::int32_t> reqs; };
-  const Case cases[] = {
-      {Curve::kCircle, 2, 2, {1, 2, 3}},         {Curve::kCircle, 2, 4, {1, 3, 6}},
-      {Curve::kCircle, 2, 4 + 32768, {1, 2, 3}}, {Curve::kCircle, 2, 8, {1, 3, 6}},
-      {Curve::kCircle, 4, 8, {1, 2, 3, 6}},
-      {Curve::kCircle, 12, 4, {1, 2, 3, 6}},  // n = 12: workspace at every tangent
+  struct Case { Path r; Ints reqs; };  // the requests the evaluation routine may see
+  const Curve circle(Curve::kCircle, 2), viviani(Curve::kViviani, 3);
+  // clang-format off
+  Case cases[] = {
+      {{circle, e1, e2, {3}, 1e-4, 0.01, 2}, {1, 2, 3}},
+      {{circle, e1, e2, {3}, 1e-4, 0.01, 4}, {1, 3, 6}},
+      {{circle, e1, e2, {3}, 1e-4, 0.01, 4 + 32768}, {1, 2, 3}},
+      {{circle, e1, e2, {3}, 1e-4, 0.01, 8}, {1, 3, 6}},
+      {{Curve(Curve::kCircle, 4), axis(4, 0), axis(4, 1), {3}, 1e-4, 0.01, 8}, {1, 2, 3, 6}},
+      {{Curve(Curve::kCircle, 12), axis(12, 0), axis(12, 1)}, {1, 2, 3, 6}},  // workspace
       // Viviani's curve from (0, 0, 2) along y, through its crossing at (2, 0, 0).
-      {Curve::kViviani, 3, 4, {1, 2, 3, 6}}, {Curve::kViviani, 3, 2 + 262144, {1, 2, 3}},
+      {{viviani, {0, 0, 2}, {0, 1, 0}, {3}, 1e-4, 0.01, 4}, {1, 2, 3, 6}},
+      {{viviani, {0, 0, 2}, {0, 1, 0}, {3}, 1e-4, 0.01, 2 + 262144}, {1, 2, 3}},
       // x^2/4 + y^2 = 1 from (0, 1) to the right leaves |x| <= 1.5 at (1.5, sqrt(0.4375)).
-      {Curve::kEllipse, 2, 4, {1, 2, 3, 6}}};
-  for (const Case& k : cases) {
-    SCOPED_TRACE(testing::Message() << k.kind << " " << k.n << " " << k.mode);
-    const bool vivi = k.kind == Curve::kViviani, ellipse = k.kind == Curve::kEllipse;
-    Path r{Curve(k.kind, k.n, ellipse ? 4.0 : 1.0), axis(k.n, vivi ? 2 : ellipse ? 1 : 0),
-           axis(k.n, ellipse ? 0 : 1)};
-    if (vivi) r.x0[2] = 2.0;
-    if (ellipse) r.half = {1.5, 2.0};
-    r.mode = k.mode;
+      {{Curve(Curve::kEllipse, 2, 4.0), e2, e1, {1.5, 2.0}}, {1, 2, 3, 6}}};
+  // clang-format on
+  for (Case& k : cases) {
+    Path& r = k.r;
+    const std::int32_t n = r.c.n;
+    SCOPED_TRACE(testing::Message() << n << " " << r.mode);
     EXPECT_TRUE(trace(r).empty());
     EXPECT_EQ(r.ierr, 0);
     expect_sound(r, 2);
     const double* end = r.x(r.count - 1);
-    if (ellipse) {
+    if (r.half[0] == 1.5) {
       EXPECT_EQ(bits(end[0]), bits(1.5));
       EXPECT_NEAR(end[1], std::sqrt(0.4375), 1e-9);
     } else {  // the last point is x0 itself, with d0
       EXPECT_GT(r.count, 20);
-      EXPECT_EQ(bitsv(end, k.n), bitsv(r.x0));
-      EXPECT_EQ(bitsv(end + k.n, k.n), bitsv(r.d0));
+      EXPECT_EQ(bitsv(end, n), bitsv(r.x0));
+      EXPECT_EQ(bitsv(end + n, n), bitsv(r.d0));
     }
     EXPECT_EQ(r.c.reqs[0], 1);  // then only the requests of the case, each for one point
     for (std::int32_t req : r.c.reqs) EXPECT_TRUE(std::count(k.reqs.begin(), k.reqs.end(), req));
-    EXPECT_EQ(r.c.npts, std::vector<std::int32_t>(r.c.npts.size(), 1));
+    EXPECT_EQ(r.c.npts, Ints(r.c.npts.size(), 1));
   }
 }
 
 TEST(Ynchem, PointLimitHoldsForSmallSystemsOnly) {
   // A unit circle in steps of 0.9 * 0.001: x0, 6981 full steps (2 pi / 0.0009 = 6981.3), then
-  // x0 again, 6983 points; n = 3 stops at the 5001st.
-  for (std::int32_t n : {3, 5}) {
-    Path r{Curve(Curve::kCircle, n), axis(n, 0), axis(n, 1), {3.0}, 1e-5, 0.001, 2};
-    const std::vector<Frame> frames = trace(r), limit{{4720, "YNCHEM  ", 8}};
-    EXPECT_EQ(r.ierr, n == 3 ? 4720 : 0);
-    EXPECT_NEAR(r.count, n == 3 ? 0 : 6983, 1);
-    EXPECT_EQ(frames, n == 3 ? limit : std::vector<Frame>{});
-  }
+  // x0 again, 6983 points (n = 3 stops at the 5001st, among the failures).
+  Path r{Curve(Curve::kCircle, 5), axis(5, 0), axis(5, 1), {3.0}, 1e-5, 0.001, 2};
+  EXPECT_TRUE(trace(r).empty());
+  EXPECT_EQ(r.ierr, 0);
+  EXPECT_NEAR(r.count, 6983, 1);
 }
 
 TEST(Ynchem, FailuresLeaveNoTableAndTheirFrames) {
-  // d0 = (dx, dy, 0...) from x0 = (1, 0, ...) in the box |x_i| <= 1; the names of the frames,
-  // all with code ierr.
-  struct Case {
-    int n, mode, store;
-    double dx, dy, lo;
-    int fail, after, ierr;
-    std::vector<const char*> frames;
-  };
-  const Case cases[] = {
-      {2, 4, 3, 0, 1, 1e-4, 0, 0, 4718, {"YNCHEM  "}},  // store bit 0
-      {2, 4, 10, 1, 0, 1e-4, 0, 0, 4721, {}},           // on a face pointing out
-      {2, 2, 10, 0, 1, 0.2, 0, 0, 4721, {}},            // the first step collapses
-      {2, 4, 10, 0, NAN, 1e-4, 0, 0, 4713, {"WNCGOO  ", "YNCHEM  "}},
+  // From x0 = (1, 0, ...) in the box |x_i| <= 1 but for the point limit; the names of the
+  // frames, all with code ierr.
+  struct Case { Path r; int fail, after, ierr; std::vector<const char*> frames; };
+  const Curve circle(Curve::kCircle, 2), circle3(Curve::kCircle, 3);
+  const Reals nan = {0, NAN}, e13 = {1, 0, 0}, e23 = {0, 1, 0};
+  // clang-format off
+  Case cases[] = {
+      {{circle, e1, e2, {1}, 1e-4, 0.01, 4, 3}, 0, 0, 4718, {"YNCHEM  "}},  // store bit 0
+      {{circle, e1, e1, {1}}, 0, 0, 4721, {}},                 // on a face pointing out
+      {{circle, e1, e2, {1}, 0.2, 0.01, 2}, 0, 0, 4721, {}},   // the first step collapses
+      {{circle, e1, nan, {1}}, 0, 0, 4713, {"WNCGOO  ", "YNCHEM  "}},
+      {{circle3, e13, e23, {3}, 1e-5, 0.001, 2}, 0, 0, 4720, {"YNCHEM  "}},  // point limit
       // The routine fails in a correction.
-      {2, 4, 10, 0, 1, 1e-4, 4242, 2, 4242, {"WNCGF2;", "WNCGOO  ", "YNCHEM  "}},
-      {3, 4, 10, 0, 1, 1e-4, 4242, 2, 4242, {"WNCGOO  ", "YNCHEM  "}},
+      {{circle, e1, e2, {1}}, 4242, 2, 4242, {"WNCGF2;", "WNCGOO  ", "YNCHEM  "}},
+      {{circle3, e13, e23, {1}}, 4242, 2, 4242, {"WNCGOO  ", "YNCHEM  "}},
       // wncgf2 takes the routine's 4716 for an iterate leaving the box: the steps collapse.
-      {2, 4, 10, 0, 1, 1e-4, 4716, 2, 4721, {}},
-      {2, 4, 10, 0, 1, 1e-4, 4715, 1, 4718, {"YNCHEM  "}}};  // 4715 for the tangent
-  for (const Case& k : cases) {
-    Path r{Curve(Curve::kCircle, k.n), axis(k.n, 0), axis(k.n, 0, k.dx), {1.0}, k.lo};
-    r.c.fail_code = k.fail, r.c.fail_after = k.after;
-    r.d0[1] = k.dy, r.mode = k.mode, r.store = k.store;
+      {{circle, e1, e2, {1}}, 4716, 2, 4721, {}},
+      {{circle, e1, e2, {1}}, 4715, 1, 4718, {"YNCHEM  "}}};  // 4715 for the tangent
+  // clang-format on
+  for (Case& k : cases) {
+    k.r.c.fail_code = k.fail, k.r.c.fail_after = k.after;
     std::vector<Frame> want;
     for (const char* name : k.frames) want.push_back({k.ierr, name, std::int32_t(strlen(name))});
-    EXPECT_EQ(trace(r), want) << k.ierr;
-    EXPECT_EQ((Ints{r.result, r.ierr, r.itab}), (Ints{1, k.ierr, 0}));
+    EXPECT_EQ(trace(k.r), want) << k.ierr;
+    EXPECT_EQ((Ints{k.r.result, k.r.ierr, k.r.itab, k.r.count}), (Ints{1, k.ierr, 0, 0}));
   }
 }
 
@@ -145,5 +142,3 @@ TEST(Ynchem, WithoutRecordKind2TheLookupQuirkDecides) {
     EXPECT_EQ((Ints{r.result, r.ierr}), (Ints{1, 4721}));
   }).join();
 }
-
-}  // namespace

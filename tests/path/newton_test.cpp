@@ -2,8 +2,6 @@
 // (wncgoo's halving and collapse are exercised through ynchem.)
 #include "curves.h"
 
-namespace {
-
 // F(x, y) = (x - 1)^k + shift, one equation in two unknowns (req 1 and 2 blocks only).
 struct Power { int k; double shift; int calls = 0; };
 std::int32_t eval_power(void* ctx, const std::int32_t*, const double* x, const std::int32_t* req,
@@ -73,5 +71,3 @@ TEST(Wncgf2, SafeguardedSearchBracketsAnOvershootingNewtonStep) {
   EXPECT_EQ(bits(x[1]), bits(0.75));
   EXPECT_GT(c.reqs.size(), 3u);  // more than the Newton steps
 }
-
-}  // namespace

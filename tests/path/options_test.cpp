@@ -1,8 +1,6 @@
 // tests/path/options_test.cpp -- checks for path/options.cpp: wnccmd, wnccim, wnccex.
 #include "curves.h"
 
-namespace {
-
 // Step bounds (0.01, 0.2) and tolerances 0.1 for up to four unknowns (kPas2 for two).
 const double kPas[8] = {0.01, 0.01, 0.01, 0.01, 0.2, 0.2, 0.2, 0.2};
 const double kTol[4] = {0.1, 0.1, 0.1, 0.1};
@@ -30,7 +28,7 @@ TEST(Wnccmd, OptionWordsAreAcceptedOrRefusedAsTabled) {
   const double equal_pas[4] = {0.1, 0.01, 0.1, 0.2};  // pas(1,1) = pas(1,2): strict
   const double bad_tol[2] = {0.0, 0.1}, tol_pair[2] = {0.1, 0.2}, tol_nan[2] = {0.1, NAN};
   struct Case {
-    std::int32_t mode, store, variant, ierr, kind = 0, order = 0, n = 4;
+    int mode, store, variant, ierr, kind = 0, order = 0, n = 4;
     const double *tol = kTol, *pas = kPas;
   };
   // clang-format off
@@ -102,5 +100,3 @@ TEST(Wnccex, FirstFormKeepsOnlyTheRequestedMembersAndAdjustsOptions) {
   EXPECT_EQ(e.options.flag18, 0);
   EXPECT_EQ(e.slots(&Orvq7PathSlot::width), (Ints{0, 0, 0, 1, 1, 2, 0, 0, 0, 0, 0}));
 }
-
-}  // namespace

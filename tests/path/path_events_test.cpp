@@ -2,8 +2,6 @@
 // (with wnctob and the quadratic model), wnccar, wncver.
 #include "curves.h"
 
-namespace {
-
 const double kXd[4] = {1.0, 0.0, 0.0, 1.0};  // x0 = (1, 0), d0 = (0, 1)
 const double kEps = 1e-20;
 const std::int32_t kN = 2;
@@ -115,5 +113,3 @@ TEST(Wncver, TurnTestIsStrictAndTheChordTestScalesByTheTolerance) {
     EXPECT_EQ(bits(dot), bits(k.tnew[0]));
   }
 }
-
-}  // namespace

@@ -3,8 +3,6 @@
 
 #include "curves.h"
 
-namespace {
-
 const double kPas[6] = {0.01, 0.01, 0.01, 0.5, 0.3, 0.7};  // read for n = 3 only
 
 struct Step { std::int32_t n, kind, per_unknown, variant; double b, g, tol[3], t[3], c[3]; };
@@ -110,5 +108,3 @@ TEST(Wncpas, RefusalsRecordTheirFramesAndLeaveTheStep) {
   EXPECT_EQ(frames.frames(), want);  // none for n < 2
   EXPECT_EQ(bitsv({m.h, m.f}), bitsv({0.125, 0.5}));
 }
-
-}  // namespace

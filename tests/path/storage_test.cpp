@@ -1,8 +1,6 @@
 // tests/path/storage_test.cpp -- checks for path/storage.cpp: wncflu, wncfst, yncrea, yncend.
 #include "curves.h"
 
-namespace {
-
 std::int32_t count_of(std::int32_t itab, std::int32_t kind, std::int32_t* handle = nullptr) {
   std::int32_t h = -1, count = -1, ierr = -1;
   EXPECT_EQ(yncrea(&itab, &kind, &h, &count, &ierr), 0) << kind;
@@ -17,10 +15,8 @@ TEST(Wncflu, AppendsSkipsAndReplacesThenRecordsTheCounts) {
   r.march.nstored = 1;
   // Points (a, b) with tangent (b, -a): the start point creates the result; the third is not
   // stored; the end point replaces the second.
-  const struct {
-    double a, b;
-    std::int32_t phase, accepted;
-  } points[] = {{1.5, 2.5, 0, 1}, {3.25, -4.75, 1, 1}, {9.0, 9.0, 1, 0}, {5.125, 6.0, 2, 2}};
+  const struct { double a, b; int phase, accepted; } points[] = {
+      {1.5, 2.5, 0, 1}, {3.25, -4.75, 1, 1}, {9.0, 9.0, 1, 0}, {5.125, 6.0, 2, 2}};
   for (const auto& p : points) {
     r.march.x[0] = p.a, r.march.x[1] = p.b, r.march.t[0] = p.b, r.march.t[1] = -p.a;
     ASSERT_EQ(r.flush(p.phase, p.accepted), 0);
@@ -102,5 +98,3 @@ TEST(Wncfst, RefusedTablesLeaveNothingBehind) {
   EXPECT_EQ(orvq7sys_table_live(), live0);
   EXPECT_EQ((Ints{r.flush(3, 1), r.ierr, r.flush(1, -1), r.ierr}), (Ints{1, 4712, 1, 4712}));
 }
-
-}  // namespace

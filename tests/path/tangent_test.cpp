@@ -1,8 +1,6 @@
 // tests/path/tangent_test.cpp -- checks for path/tangent.cpp: ynumde.
 #include "curves.h"
 
-namespace {
-
 TEST(Ynumde, TangentsComeFromOneEvaluationForAllPoints) {
   // The outputs bit for bit, or to four ulps (zeros of either sign).
   struct Case { Curve::Kind kind; int n; double p; Ints npts_req; Reals x, want; bool bits; };
@@ -80,5 +78,3 @@ TEST(Ynumde, WorkAreaAbove210RealsComesFromTheWorkspace) {
   ws.refuse_next(1);  // the refused call never evaluates
   EXPECT_EQ((Ints{tangent(106, 2), ierr, int(line.reqs.size())}), (Ints{1, 36, 4}));
 }
-
-}  // namespace
