@@ -54,8 +54,7 @@ struct Curve {
 inline std::int32_t eval_curve(void* ctx, const std::int32_t* npts, const double* x,
                                const std::int32_t* req, double* out, std::int32_t* ierr) {
   Curve& c = *static_cast<Curve*>(ctx);
-  c.reqs.push_back(*req);
-  c.npts.push_back(*npts);
+  c.reqs.push_back(*req), c.npts.push_back(*npts);
   const std::size_t call = c.reqs.size() - 1;
   if (c.fail_code != 0 && call >= c.fail_after) return *ierr = c.fail_code, 1;
   const std::int32_t n = c.n, m = n - 1;
@@ -89,11 +88,9 @@ inline std::vector<std::uint64_t> bitsv(Reals v) { return bitsv(v.data(), v.size
 // The records of one path, decoded by wnccmd for n unknowns with step bounds (0.001, 0.25)
 // and tolerance 0.01.
 struct PathRecords {
-  PathRecords(std::int32_t n, std::int32_t mode, std::int32_t store, std::int32_t variant = 1)
-      : dim(n) {
+  PathRecords(int n, int mode, int store, int var = 1) : dim(n) {
     for (std::int32_t i = 0; i < n; ++i) pas[i] = 0.001, pas[n + i] = 0.25, tol[i] = 0.01;
-    result =
-        wnccmd(&dim, pas, &mode, tol, &store, &variant, &options, limits, &layout, pairs, &ierr);
+    result = wnccmd(&dim, pas, &mode, tol, &store, &var, &options, limits, &layout, pairs, &ierr);
   }
   std::int32_t flush(std::int32_t phase, std::int32_t accepted) {
     return wncflu(&phase, &accepted, &options, &layout, &march, &tables, &itab, &ierr);
@@ -120,8 +117,8 @@ std::vector<T> read_kind(std::int32_t itab, std::int32_t kind, std::int32_t* cou
 
 // A path traced by ynchem from x0 along d0 in the box |x_i| <= half_i (the last half given
 // stands for the remaining unknowns), steps (lo, 0.25), tol(1) = tol, and what it left: the
-// result, code, and the points with their tangents (kind 23), phases and numbers (kinds 1, 2,
-// when stored), read back before the result is released.
+// result, code, frames, and the points with their tangents (kind 23), phases and numbers
+// (kinds 1, 2, when stored), read back before the result is released.
 struct Path {
   Curve c;
   Reals x0, d0, half = {3.0};
@@ -129,6 +126,7 @@ struct Path {
   std::int32_t mode = 4, store = 2 + 8, result = -1, ierr = -1, itab = -1, count = 0;
   Reals xt{};
   Ints phase{}, number{};
+  std::vector<Frame> frames{};  // recorded by ynchem
   const double* x(std::int32_t j) const { return xt.data() + 2 * c.n * j; }
 
   void run() {
@@ -141,14 +139,14 @@ struct Path {
     }
     tols[0] = tol;
     const double eps = 1e-20;
+    RecordedFrames rec;
     result = ynchem(&c, &c.n, eval_curve, &eps, xd.data(), box.data(), pas.data(), &mode,
                     tols.data(), &store, &itab, &ierr);
+    frames = rec.frames();
     if (itab == 0) return;
     xt = read_kind<double>(itab, 23, &count);
-    if ((store & (8 | 16 | 32)) != 0) {
-      phase = read_kind<std::int32_t>(itab, 1);
-      number = read_kind<std::int32_t>(itab, 2);
-    }
+    phase = read_kind<std::int32_t>(itab, 1);
+    number = read_kind<std::int32_t>(itab, 2);
     std::int32_t code = -1;
     yncend(&itab, &code);
   }

@@ -32,21 +32,23 @@ TEST(Wnccmd, OptionWordsAreAcceptedOrRefusedAsTabled) {
     const double *tol = kTol, *pas = kPas;
   };
   // clang-format off
+  // Store bit 0 refused; the first group allowed; order level 2 needs K = 4 or 8; per unknown
+  // tolerances with K = 4 only; K = 1 for the extremum path only; no kind, two kinds, mode bits
+  // 4, 14, 20 and 31; store bits 29 and 15, no store bit, no pair; store bits 6 and 31
+  // ignored; the second group for the extremum path only; variants 3 and 0. Then the checks
+  // in their order: n, step bounds, the words, tol (every one when per unknown), store.
   const Case cases[] = {
-      {4, 2, 1, 0, 4, 1}, {4, 3, 1, 4718}, {2, 2, 1, 0, 2, 0}, {8, 2 + 8, 1, 0, 8, 1},  // store 0
-      {4 + kB15, 2, 1, 0, 4, 2}, {2 + kB15, 2, 1, 4718},  // order level 2 needs K = 4, 8
-      {8 + kB16, 2, 1, 4718}, {8 + kB16, 2, 2, 4718}, {4 + kB16, 2, 1, 0, 4, 1},  // per unknown
-      {1, 2, 1, 4718}, {1, 2, 2, 0, 1, 0},  // K = 1: extremum only
+      {4, 2, 1, 0, 4, 1}, {4, 3, 1, 4718}, {2, 2, 1, 0, 2, 0}, {8, 2 + 8, 1, 0, 8, 1},
+      {4 + kB15, 2, 1, 0, 4, 2}, {2 + kB15, 2, 1, 4718}, {8 + kB16, 2, 1, 4718},
+      {8 + kB16, 2, 2, 4718}, {4 + kB16, 2, 1, 0, 4, 1}, {1, 2, 1, 4718}, {1, 2, 2, 0, 1, 0},
       {0, 2, 1, 4718}, {0, 2, 2, 4718}, {3, 2, 2, 4718}, {16, 2, 2, 4718}, {4 + 16384, 2, 1, 4718},
-      {4 + (1 << 20), 2, 1, 4718}, {int(0x80000004u), 2, 1, 4718},  // mode bits 20, 31
-      {4, 2 + kB29, 1, 4718}, {1, 8 + kB29, 2, 4718}, {4, 2 + kB15, 1, 4718}, {4, 0, 1, 4718},
-      {4, 64 + 1024, 2, 4718}, {4, int(0x80000042u), 1, 0, 4, 1},  // no pair; bits 6, 31 ignored
-      {4, 2 + 128, 1, 4718}, {2, 2 + 128, 2, 0, 2, 1}, {4, 2, 3, 4718}, {4, 2, 0, 4718},
-      // The checks in their order: n, step bounds, the words, tol (every one when per
-      // unknown), store.
-      {4, 2, 1, 4712, 0, 0, 1}, {4, 2, 1, 4718, 0, 0, 21}, {3, 0, 1, 4712, 0, 0, 2, kTol, bad_pas},
-      {4, 2, 1, 4712, 0, 0, 2, kTol, equal_pas}, {3, 0, 1, 4718, 0, 0, 2, bad_tol, kPas2},
-      {4, 0, 1, 4712, 0, 0, 2, bad_tol, kPas2}, {4 + kB16, 2, 1, 0, 4, 1, 2, tol_pair, kPas2},
+      {4 + (1 << 20), 2, 1, 4718}, {int(0x80000004u), 2, 1, 4718}, {4, 2 + kB29, 1, 4718},
+      {1, 8 + kB29, 2, 4718}, {4, 2 + kB15, 1, 4718}, {4, 0, 1, 4718}, {4, 64 + 1024, 2, 4718},
+      {4, int(0x80000042u), 1, 0, 4, 1}, {4, 2 + 128, 1, 4718}, {2, 2 + 128, 2, 0, 2, 1},
+      {4, 2, 3, 4718}, {4, 2, 0, 4718}, {4, 2, 1, 4712, 0, 0, 1}, {4, 2, 1, 4718, 0, 0, 21},
+      {3, 0, 1, 4712, 0, 0, 2, kTol, bad_pas}, {4, 2, 1, 4712, 0, 0, 2, kTol, equal_pas},
+      {3, 0, 1, 4718, 0, 0, 2, bad_tol, kPas2}, {4, 0, 1, 4712, 0, 0, 2, bad_tol, kPas2},
+      {4 + kB16, 2, 1, 0, 4, 1, 2, tol_pair, kPas2},
       {4 + kB16, 2, 1, 4712, 0, 0, 2, tol_nan, kPas2}};
   // clang-format on
   for (const Case& w : cases) {
@@ -76,9 +78,8 @@ TEST(Wnccmd, StorageRequestBecomesPairsAndSlots) {
   const double pas[6] = {0.01, 0.01, 0.01, 0.2, 0.2, 0.2};
   const Decoded d(3, 4, 2 + 4 + 16, 1, kTol, pas);
   ASSERT_EQ(d.ierr, 0);
-  Ints pairs = {6, 23, 6, 43, 0, 1, 0, 2, 0, 3};
-  pairs.resize(22);
-  EXPECT_EQ(Ints(d.pairs, d.pairs + 22), pairs);
+  EXPECT_EQ(Ints(d.pairs, d.pairs + 22),
+            (Ints{6, 23, 6, 43, 0, 1, 0, 2, 0, 3, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0}));
   EXPECT_EQ((Ints{d.layout.nused, d.layout.form1, d.layout.nvalues}), (Ints{5, 2, 17}));
   EXPECT_EQ(d.slots(&Orvq7PathSlot::width), (Ints{0, 6, 6, 1, 1, 3, 0, 0, 0, 0, 0}));
   EXPECT_EQ(d.slots(&Orvq7PathSlot::offset), (Ints{0, 0, 6, 12, 13, 14, 0, 0, 0, 0, 0}));

@@ -11,8 +11,7 @@ Orvq7PathMarch on_circle(double angle, std::int32_t nstored) {
   Orvq7PathMarch m{};
   m.x[0] = std::cos(angle), m.x[1] = std::sin(angle);
   m.t[0] = m.tprev[0] = -m.x[1], m.t[1] = m.tprev[1] = m.x[0];
-  m.h = m.hprev = 0.25, m.f = m.g = 1.0;
-  m.nstored = nstored, m.treq = 2;
+  m.h = m.hprev = 0.25, m.f = m.g = 1.0, m.nstored = nstored, m.treq = 2;
   return m;
 }
 
@@ -61,16 +60,13 @@ TEST(Wnccar, RedoesWithThreeQuartersOfTheFactorOrClassifiesThePoint) {
   const double k30 = 30.0 * 3.14159265358979323846 / 180.0;
   // The point kept at `angle` on the unit circle; the current point is (1, 0).
   struct Case { double angle; std::int32_t mode, special, nstored; double lo, hi; Ints want; };
+  // A 30 degree turn: cos 30 = 0.866 < 0.92388; accepted with mode bit 18, unless the step
+  // is beyond a maximum step. An end point within the minimum steps replaces the last point
+  // of a longer path; closed: back to x0 with d0. want = (redo, accepted, special).
   const Case cases[] = {
-      // A 30 degree turn: cos 30 = 0.866 < 0.92388; accepted with mode bit 18, unless the
-      // step is beyond a maximum step. want = (redo, accepted, special).
-      {k30, 2, 0, 3, 1e-3, 1.0, {1, 1, 0}},
-      {k30, 2 + 262144, 0, 3, 1e-3, 1.0, {0, 1, 0}},
-      {k30, 2 + 262144, 1, 3, 1e-3, 0.3, {1, 1, 0}},
-      // An end point within the minimum steps replaces the last point of a longer path.
-      {0.005, 2, 1, 2, 0.01, 1.0, {0, 2, 1}},
-      {0.05, 2, 1, 2, 0.01, 1.0, {0, 1, 1}},
-      {0.05, 2, 2, 9, 0.01, 1.0, {0, 1, 2}}};  // closed: back to x0 with d0
+      {k30, 2, 0, 3, 1e-3, 1.0, {1, 1, 0}}, {k30, 2 + 262144, 0, 3, 1e-3, 1.0, {0, 1, 0}},
+      {k30, 2 + 262144, 1, 3, 1e-3, 0.3, {1, 1, 0}}, {0.005, 2, 1, 2, 0.01, 1.0, {0, 2, 1}},
+      {0.05, 2, 1, 2, 0.01, 1.0, {0, 1, 1}}, {0.05, 2, 2, 9, 0.01, 1.0, {0, 1, 2}}};
   for (const Case& k : cases) {
     SCOPED_TRACE(testing::Message() << k.angle << " " << k.special << " " << k.hi);
     PathRecords r(2, k.mode, 2);

@@ -47,21 +47,18 @@ TEST(Wncini, StartsAlongTheGivenDirectionAndStoresTheFirstPoint) {
 TEST(Wncini, ChecksRunUnknownByUnknownThenTheResidual) {
   struct Case { Reals xd, box; double eps; int ierr, evaluations, n = 2, fail_code = 0; };
   const Reals in = {1, 0, 0, 1};
+  // Bounds out of order, equal, outside; unknown 1 on its lower face with d0 pointing out
+  // (4721 before unknown 2 is looked at), the upper face, outside before the face; on the
+  // upper face y = 1 moving along it: started, residual then tangent (K = 2); off the circle
+  // (residual 0.25^2 above eps), eps not a number; the routine's failure passed on unchanged;
+  // n = 1 and 21.
   const Case cases[] = {
-      {in, {2, -2, -2, 2}, 1e-12, 4712, 0},   // bounds out of order
-      {in, {1, -2, 1, 2}, 1e-12, 4712, 0},    // equal bounds
-      {in, {-2, 0.5, 2, 2}, 1e-12, 4712, 0},  // outside
-      // Unknown 1 on its lower face, d0 pointing out: 4721 before unknown 2 is looked at.
-      {{-2, 9, -1, 0}, kBox, 1e-12, 4721, 0},
-      {{1, 2, 0, 0.5}, kBox, 1e-12, 4721, 0},  // upper face
-      {{5, -2, 0, -1}, kBox, 1e-12, 4712, 0},  // outside before the face
-      // On the upper face y = 1, moving along it: started, residual then tangent (K = 2).
-      {{0, 1, 1, 0}, {-2, -2, 2, 1}, 0.0, 0, 2},
-      {{1.5, 0, 0, 1}, kBox, 1e-3, 4712, 1},  // off the circle: residual 0.25^2 above eps
-      {in, kBox, NAN, 4712, 1},
-      {in, kBox, 1e-12, 4715, 1, 2, 4715},  // the routine's failure is passed on unchanged
-      {in, kBox, 1e-12, 4712, 0, 1},
-      {in, kBox, 1e-12, 4718, 0, 21}};
+      {in, {2, -2, -2, 2}, 1e-12, 4712, 0}, {in, {1, -2, 1, 2}, 1e-12, 4712, 0},
+      {in, {-2, 0.5, 2, 2}, 1e-12, 4712, 0}, {{-2, 9, -1, 0}, kBox, 1e-12, 4721, 0},
+      {{1, 2, 0, 0.5}, kBox, 1e-12, 4721, 0}, {{5, -2, 0, -1}, kBox, 1e-12, 4712, 0},
+      {{0, 1, 1, 0}, {-2, -2, 2, 1}, 0.0, 0, 2}, {{1.5, 0, 0, 1}, kBox, 1e-3, 4712, 1},
+      {in, kBox, NAN, 4712, 1}, {in, kBox, 1e-12, 4715, 1, 2, 4715},
+      {in, kBox, 1e-12, 4712, 0, 1}, {in, kBox, 1e-12, 4718, 0, 21}};
   for (const Case& k : cases) {
     PathRecords r(2, 2, 2);
     Curve c(Curve::kCircle, 2);

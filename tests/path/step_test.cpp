@@ -88,9 +88,7 @@ TEST(Wncpas, OtherVariantsReuseTheLastBoundOfThisThread) {
   EXPECT_NEAR(m.h, 0.0486, 1e-17);
   double other = -1.0;  // another thread starts from 0
   std::thread([&] {
-    Orvq7PathMarch mm;
-    std::int32_t e = -1;
-    if (step(fallback, &mm, &e) == 0) other = mm.h;
+    if (Orvq7PathMarch mm; step(fallback, &mm, &ierr) == 0) other = mm.h;
   }).join();
   EXPECT_EQ(bits(other), bits(0.0));
 }
@@ -104,7 +102,7 @@ TEST(Wncpas, RefusalsRecordTheirFramesAndLeaveTheStep) {
                   step({21, 2, 0, 1, 0, 1, {0.1}, {1, 0}, {}}, &m, &e2, false),
                   step({1, 2, 0, 1, 0, 1, {0.1}, {1, 0}, {}}, &m, &e3, false), e1, e2, e3}),
             (Ints{1, 1, 1, 4718, 4718, 4712}));
-  const std::vector<Frame> want = {{4718, "WNCPAS  ", 8}, {4718, "WNCPAS  ", 8}};
-  EXPECT_EQ(frames.frames(), want);  // none for n < 2
+  // None for n < 2.
+  EXPECT_EQ(frames.frames(), (std::vector<Frame>{{4718, "WNCPAS  ", 8}, {4718, "WNCPAS  ", 8}}));
   EXPECT_EQ(bitsv({m.h, m.f}), bitsv({0.125, 0.5}));
 }

@@ -36,17 +36,17 @@ TEST(Ynumde, TangentsComeFromOneEvaluationForAllPoints) {
 TEST(Ynumde, RefusalsLeaveTheOutputs) {
   // At the point (x1, 0, ...); the routine fails with `fail` when it is not 0.
   struct Case { Curve::Kind kind; int n; double p, x1; int npts, req, fail, ierr, evaluations; };
+  // A zero gradient; a NaN gradient has no direction; the plane's gradient of squared length
+  // 1e-12 (< 1e-10) is degenerate, although the cross product's squared length 4e-12 is above
+  // 1e-24. n = 1, 21; req 3, 1; no point. The routine's failures: 4715 becomes 4718, any other
+  // code is passed on.
+  const Curve::Kind C = Curve::kCircle;
   const Case cases[] = {
-      {Curve::kCircle, 2, 0, 0, 1, 2, 0, 4710, 1},    // zero gradient
-      {Curve::kCircle, 2, 1, NAN, 1, 2, 0, 4710, 1},  // a NaN gradient has no direction
-      // The plane's gradient of squared length 1e-12 (< 1e-10) is degenerate, although the
-      // cross product's squared length 4e-12 is above 1e-24.
-      {Curve::kSpherePlane, 3, 1e-6, 1, 1, 2, 0, 4710, 1},
-      {Curve::kCircle, 1, 1, 1, 1, 2, 0, 4712, 0},  {Curve::kCircle, 21, 1, 1, 1, 2, 0, 4718, 0},
-      {Curve::kCircle, 2, 1, 1, 1, 3, 0, 4718, 0},  {Curve::kCircle, 2, 1, 1, 1, 1, 0, 4718, 0},
-      {Curve::kCircle, 2, 1, 1, 0, 2, 0, 4712, 0},  // no point
-      // The routine's failures: 4715 becomes 4718, any other code is passed on.
-      {Curve::kCircle, 2, 1, 1, 1, 2, 4715, 4718, 1}, {Curve::kCircle, 2, 1, 1, 1, 6, 777, 777, 1}};
+      {C, 2, 0, 0, 1, 2, 0, 4710, 1}, {C, 2, 1, NAN, 1, 2, 0, 4710, 1},
+      {Curve::kSpherePlane, 3, 1e-6, 1, 1, 2, 0, 4710, 1}, {C, 1, 1, 1, 1, 2, 0, 4712, 0},
+      {C, 21, 1, 1, 1, 2, 0, 4718, 0}, {C, 2, 1, 1, 1, 3, 0, 4718, 0},
+      {C, 2, 1, 1, 1, 1, 0, 4718, 0}, {C, 2, 1, 1, 0, 2, 0, 4712, 0},
+      {C, 2, 1, 1, 1, 2, 4715, 4718, 1}, {C, 2, 1, 1, 1, 6, 777, 777, 1}};
   for (const Case& k : cases) {
     Curve c(k.kind, k.n, k.p);
     c.fail_code = k.fail;
