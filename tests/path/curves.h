@@ -1,7 +1,10 @@
-// tests/path/curves.h -- evaluation routines of known curves, path records and result reading
-// for the path tests.
+// tests/path/curves.h -- curves given as separable quadratics, the records of a path, a path
+// traced by ynchem, and the reading of a path's result, for the path tests.
 #pragma once
+#include <gtest/gtest.h>
+
 #include <algorithm>
+#include <cmath>
 #include <cstdint>
 #include <cstring>
 #include <vector>
@@ -9,132 +12,142 @@
 #include "path/path_state.h"
 #include "support/recording_services.h"
 
-// The system evaluated, its parameter, and what the solver asked of it.
+using Ints = std::vector<std::int32_t>;
+using Reals = std::vector<double>;
+
+// n - 1 equations F_k(x) = sum over i of (a_ki x_i + b_ki) x_i - c_k, and what the solver
+// asked of them. Calls from number fail_after on fail with fail_code (when non-zero); calls
+// from number poison_after on write `poison` into every value.
 struct Curve {
-  enum Kind {
-    kCircle,       // n = 2: x^2 + y^2 - p
-    kSpherePlane,  // n = 3: x^2 + y^2 + z^2 - 1, p * z
-    kCircle4,      // n = 4: x1^2 + x2^2 - 1, x3, x4
-    kLinear,       // any n: F_k = x_k, k = 1..n-1
-    kEllipse,      // n = 2: x^2 / p + y^2 - 1
-    kViviani,      // n = 3: x^2 + y^2 + z^2 - 4, (x - 1)^2 + y^2 - 1
-    kCircleN,      // any n: x1^2 + x2^2 - p, x3, ..., xn
-  };
-  Curve(Kind k, std::int32_t dim, double param = 1.0) : kind(k), n(dim), p(param) {}
-  Kind kind;
+  // kCircle: x1^2 + x2^2 = p, x3 = ... = xn = 0; kEllipse: x^2 / p + y^2 = 1 (p a power of 2);
+  // kSpherePlane: x^2 + y^2 + z^2 = 1, p z = 0; kViviani: x^2 + y^2 + z^2 = 4,
+  // (x - 1)^2 + y^2 = 1; kLinear: x_k = 0 for k = 1..n-1.
+  enum Kind { kCircle, kEllipse, kSpherePlane, kViviani, kLinear };
+  Curve(Kind kind, std::int32_t dim, double p = 1.0) : n(dim) {
+    for (int k = 0; k < n - 1; ++k) b[k][kind == kLinear ? k : k + 1] = 1.0;
+    if (kind == kCircle) a[0][0] = a[0][1] = 1.0, b[0][1] = 0.0, c[0] = p;
+    if (kind == kEllipse) a[0][0] = 1.0 / p, a[0][1] = 1.0, b[0][1] = 0.0, c[0] = 1.0;
+    if (kind == kSpherePlane || kind == kViviani) {
+      a[0][0] = a[0][1] = a[0][2] = 1.0, b[0][1] = 0.0, c[0] = kind == kViviani ? 4.0 : 1.0;
+      if (kind == kSpherePlane) b[1][2] = p;
+      if (kind == kViviani) a[1][0] = a[1][1] = 1.0, b[1][0] = -2.0, b[1][2] = 0.0;
+    }
+  }
+  // The sum of squared residuals at y, in long double (apart from the routines' rounding).
+  long double residual2(const double* y) const {
+    long double s = 0, f = 0;
+    for (int k = 0; k < n - 1; s += f * f, ++k) {
+      f = -c[k];
+      for (int i = 0; i < n; ++i) f += (a[k][i] * static_cast<long double>(y[i]) + b[k][i]) * y[i];
+    }
+    return s;
+  }
   std::int32_t n;
-  double p;
-  std::int32_t fail_code = 0;     // when non-zero, calls from number fail_after on (from 0)
-  std::size_t fail_after = 0;     // fail with it
-  std::size_t poison_after = ~std::size_t{0};  // calls from this number on return `poison`
-  double poison = 0.0;                         // in every value they write
-  std::vector<std::int32_t> reqs;
-  std::vector<std::int32_t> npts;
+  double a[20][21] = {}, b[20][21] = {}, c[20] = {};  // room for a refused n = 21
+  std::int32_t fail_code = 0;
+  std::size_t fail_after = 0, poison_after = ~std::size_t{0};
+  double poison = 0.0;
+  Ints reqs{}, npts{};
 };
 
 // Six-argument evaluation routine over a Curve context.
 inline std::int32_t eval_curve(void* ctx, const std::int32_t* npts, const double* x,
                                const std::int32_t* req, double* out, std::int32_t* ierr) {
   Curve& c = *static_cast<Curve*>(ctx);
-  c.reqs.push_back(*req);
-  c.npts.push_back(*npts);
+  c.reqs.push_back(*req), c.npts.push_back(*npts);
   const std::size_t call = c.reqs.size() - 1;
-  if (c.fail_code != 0 && call >= c.fail_after) {
-    *ierr = c.fail_code;
-    return 1;
-  }
+  if (c.fail_code != 0 && call >= c.fail_after) return *ierr = c.fail_code, 1;
   const std::int32_t n = c.n, m = n - 1;
   for (std::int32_t pt = 0; pt < *npts; ++pt) {
     const double* y = x + n * pt;
-    std::vector<double> f(m, 0.0), jac(m * n, 0.0), hes(m * n * n, 0.0);
-    auto J = [&](int k, int i) -> double& { return jac[k + m * i]; };
-    auto H = [&](int k, int i, int j) -> double& { return hes[k + m * (i + n * j)]; };
-    switch (c.kind) {
-      case Curve::kCircle:
-        f[0] = y[0] * y[0] + y[1] * y[1] - c.p;
-        J(0, 0) = 2 * y[0], J(0, 1) = 2 * y[1];
-        H(0, 0, 0) = 2, H(0, 1, 1) = 2;
-        break;
-      case Curve::kSpherePlane:
-        f[0] = y[0] * y[0] + y[1] * y[1] + y[2] * y[2] - 1, f[1] = c.p * y[2];
-        for (int i = 0; i < 3; ++i) J(0, i) = 2 * y[i], H(0, i, i) = 2;
-        J(1, 2) = c.p;
-        break;
-      case Curve::kCircle4:
-        f[0] = y[0] * y[0] + y[1] * y[1] - 1, f[1] = y[2], f[2] = y[3];
-        J(0, 0) = 2 * y[0], J(0, 1) = 2 * y[1], J(1, 2) = 1, J(2, 3) = 1;
-        H(0, 0, 0) = 2, H(0, 1, 1) = 2;
-        break;
-      case Curve::kLinear:
-        for (int k = 0; k < m; ++k) f[k] = y[k], J(k, k) = 1;
-        break;
-      case Curve::kEllipse:
-        f[0] = y[0] * y[0] / c.p + y[1] * y[1] - 1;
-        J(0, 0) = 2 * y[0] / c.p, J(0, 1) = 2 * y[1];
-        H(0, 0, 0) = 2 / c.p, H(0, 1, 1) = 2;
-        break;
-      case Curve::kViviani:
-        f[0] = y[0] * y[0] + y[1] * y[1] + y[2] * y[2] - 4;
-        f[1] = (y[0] - 1) * (y[0] - 1) + y[1] * y[1] - 1;
-        for (int i = 0; i < 3; ++i) J(0, i) = 2 * y[i], H(0, i, i) = 2;
-        J(1, 0) = 2 * (y[0] - 1), J(1, 1) = 2 * y[1];
-        H(1, 0, 0) = 2, H(1, 1, 1) = 2;
-        break;
-      case Curve::kCircleN:
-        f[0] = y[0] * y[0] + y[1] * y[1] - c.p;
-        J(0, 0) = 2 * y[0], J(0, 1) = 2 * y[1];
-        H(0, 0, 0) = 2, H(0, 1, 1) = 2;
-        for (int k = 1; k < m; ++k) f[k] = y[k + 1], J(k, k + 1) = 1;
-        break;
+    double* f = out;
+    double* jac = f + (*req & 1 ? m : 0);
+    double* hes = jac + (*req & 2 ? m * n : 0);
+    out = hes + (*req & 4 ? m * n * n : 0);
+    std::fill(f, out, 0.0);
+    for (std::int32_t k = 0; k < m; ++k) {
+      if (*req & 1) f[k] = -c.c[k];
+      for (std::int32_t i = 0; i < n; ++i) {
+        if (*req & 1) f[k] += (c.a[k][i] * y[i] + c.b[k][i]) * y[i];
+        if (*req & 2) jac[k + m * i] = 2.0 * c.a[k][i] * y[i] + c.b[k][i];
+        if (*req & 4) hes[k + m * (i + n * i)] = 2.0 * c.a[k][i];
+      }
     }
-    if (call >= c.poison_after) {
-      for (auto* v : {&f, &jac, &hes}) std::fill(v->begin(), v->end(), c.poison);
-    }
-    if (*req & 1) out = std::copy(f.begin(), f.end(), out);
-    if (*req & 2) out = std::copy(jac.begin(), jac.end(), out);
-    if (*req & 4) out = std::copy(hes.begin(), hes.end(), out);
+    if (call >= c.poison_after) std::fill(f, out, c.poison);
   }
-  *ierr = 0;
-  return 0;
+  return *ierr = 0;
 }
 
-// The records of one path, decoded by wnccmd for n unknowns with step bounds
-// (0.001, 0.25) and tolerance 0.01.
+inline std::vector<std::uint64_t> bitsv(const double* v, std::size_t n) {
+  std::vector<std::uint64_t> u(n);
+  std::transform(v, v + n, u.begin(), bits);
+  return u;
+}
+inline std::vector<std::uint64_t> bitsv(Reals v) { return bitsv(v.data(), v.size()); }
+
+// The records of one path, decoded by wnccmd for n unknowns with step bounds (0.001, 0.25)
+// and tolerance 0.01.
 struct PathRecords {
-  PathRecords(std::int32_t n, std::int32_t mode, std::int32_t store, std::int32_t variant = 1)
-      : dim(n) {
+  PathRecords(int n, int mode, int store, int var = 1) : dim(n) {
     for (std::int32_t i = 0; i < n; ++i) pas[i] = 0.001, pas[n + i] = 0.25, tol[i] = 0.01;
-    result =
-        wnccmd(&dim, pas, &mode, tol, &store, &variant, &options, limits, &layout, pairs, &ierr);
+    result = wnccmd(&dim, pas, &mode, tol, &store, &var, &options, limits, &layout, pairs, &ierr);
   }
-  std::int32_t dim;
-  double pas[40] = {};
-  double tol[20] = {};
+  std::int32_t flush(std::int32_t phase, std::int32_t accepted) {
+    return wncflu(&phase, &accepted, &options, &layout, &march, &tables, &itab, &ierr);
+  }
+  std::int32_t dim, pairs[22] = {}, itab = 0, ierr = -1, result = -1;
+  double pas[40] = {}, tol[20] = {}, limits[2] = {};
   Orvq7PathOptions options{};
-  double limits[2] = {};
   Orvq7PathLayout layout{};
-  std::int32_t pairs[22] = {};
   Orvq7PathMarch march{};
   Orvq7PathTables tables{};
-  std::int32_t itab = 0;
-  std::int32_t ierr = -1;
-  std::int32_t result = -1;
 };
 
-// The entries of the quantity of a record kind in a result, as raw 8-byte slots (an integer
-// quantity's values are read as int32 from the bytes). count receives the triple's count.
-inline std::vector<unsigned char> read_kind(std::int32_t itab, std::int32_t kind,
-                                            std::int32_t* count) {
-  std::int32_t h = 0, ierr = 0, esize = 0, entries = 0, first = 1;
-  if (yncrea(&itab, &kind, &h, count, &ierr) == 1 || h == 0) return {};
-  if (yutinf(&h, &esize, &entries, &ierr) == 1) return {};
-  std::vector<unsigned char> bytes(static_cast<std::size_t>(esize) * entries);
-  if (yutrea(&h, &first, &entries, bytes.data(), &ierr) == 1) return {};
-  return bytes;
-}
+// The values of the quantity of a record kind in a result (an integer quantity read as
+// int32); count receives the triple's count. Empty when the kind has no values.
 template <class T>
-T value_at(const std::vector<unsigned char>& bytes, std::size_t k) {
-  T v;
-  std::memcpy(&v, bytes.data() + k * sizeof(T), sizeof(T));
+std::vector<T> read_kind(std::int32_t itab, std::int32_t kind, std::int32_t* count = nullptr) {
+  std::int32_t h = 0, ierr = 0, esize = 0, entries = 0, first = 1, cnt = 0;
+  if (yncrea(&itab, &kind, &h, count ? count : &cnt, &ierr) == 1 || h == 0) return {};
+  if (yutinf(&h, &esize, &entries, &ierr) == 1) return {};
+  std::vector<T> v(static_cast<std::size_t>(esize) * entries / sizeof(T));
+  if (v.empty() || yutrea(&h, &first, &entries, v.data(), &ierr) == 1) return {};
   return v;
 }
+
+// A path traced by ynchem from x0 along d0 in the box |x_i| <= half_i (the last half given
+// stands for the remaining unknowns), steps (lo, 0.25), tol(1) = tol, and what it left: the
+// result, code, frames, and the points with their tangents (kind 23), phases and numbers
+// (kinds 1, 2, when stored), read back before the result is released.
+struct Path {
+  Curve c;
+  Reals x0, d0, half = {3.0};
+  double lo = 1e-4, tol = 0.01;
+  std::int32_t mode = 4, store = 2 + 8, result = -1, ierr = -1, itab = -1, count = 0;
+  Reals xt{};
+  Ints phase{}, number{};
+  std::vector<Frame> frames{};  // recorded by ynchem
+  const double* x(std::int32_t j) const { return xt.data() + 2 * c.n * j; }
+
+  void run() {
+    const std::int32_t n = c.n;
+    Reals xd = x0, box(2 * n), pas(2 * n), tols(n, 0.01);
+    xd.insert(xd.end(), d0.begin(), d0.end());
+    for (std::int32_t i = 0; i < n; ++i) {
+      const double h = half[std::min<std::size_t>(i, half.size() - 1)];
+      box[i] = -h, box[n + i] = h, pas[i] = lo, pas[n + i] = 0.25;
+    }
+    tols[0] = tol;
+    const double eps = 1e-20;
+    RecordedFrames rec;
+    result = ynchem(&c, &c.n, eval_curve, &eps, xd.data(), box.data(), pas.data(), &mode,
+                    tols.data(), &store, &itab, &ierr);
+    frames = rec.frames();
+    if (itab == 0) return;
+    xt = read_kind<double>(itab, 23, &count);
+    phase = read_kind<std::int32_t>(itab, 1);
+    number = read_kind<std::int32_t>(itab, 2);
+    std::int32_t code = -1;
+    yncend(&itab, &code);
+  }
+};

@@ -1,47 +1,30 @@
-// tests/path/driver_thread_test.cpp -- two paths traced by ynchem at once, on two threads.
-#include <gtest/gtest.h>
-
-#include <cstdint>
+// tests/path/driver_thread_test.cpp -- paths traced by ynchem on several threads at once.
 #include <thread>
-#include <vector>
 
 #include "curves.h"
 
-namespace {
-
-// The points and tangents of the circle (n = 2) or of Viviani's curve (n = 3), K = 4.
-std::vector<unsigned char> trace(std::int32_t n) {
-  Curve c(n == 2 ? Curve::kCircle : Curve::kViviani, n);
-  const double xd2[4] = {1, 0, 0, 1}, xd3[6] = {0, 0, 2, 0, 1, 0}, tol = 0.01, eps = 1e-20;
-  double box[6], pas[6];
-  for (std::int32_t i = 0; i < n; ++i)
-    box[i] = -3, box[n + i] = 3, pas[i] = 1e-4, pas[n + i] = 0.25;
-  const std::int32_t mode = 4, store = 2 + 8;
-  std::int32_t itab = 0, ierr = -1, count = 0;
-  if (ynchem(&c, &n, eval_curve, &eps, n == 2 ? xd2 : xd3, box, pas, &mode, &tol, &store, &itab,
-             &ierr) != 0) {
-    return {};
-  }
-  auto points = read_kind(itab, 23, &count);
-  yncend(&itab, &ierr);
-  return points;
-}
-
-TEST(YnchemThreads, TwoPathsAtOnceMatchTheirSequentialRuns) {
-  const auto circle = trace(2), viviani = trace(3);
-  ASSERT_FALSE(circle.empty() || viviani.empty());
+// Viviani's curve (K = 4) and a circle of radius^2 2 keeping phases and numbers (K = 8), each
+// traced again and again on its own thread.
+TEST(YnchemThreads, PathsAtOnceMatchTheirSequentialRuns) {
+  const std::vector<Path> paths = {
+      {Curve(Curve::kViviani, 3), {0, 0, 2}, {0, 1, 0}},
+      {Curve(Curve::kCircle, 2, 2.0), {1, 1}, {-1, 1}, {3.0}, 1e-4, 0.01, 8, 2 + 16}};
+  std::vector<Path> want = paths;
+  for (Path& p : want) p.run();
   const std::int64_t live0 = orvq7sys_table_live();
-  int mismatches[2] = {0, 0};
-  auto rounds = [&](std::int32_t n, const std::vector<unsigned char>& want, int* bad) {
-    for (int k = 0; k < 10; ++k) *bad += trace(n) != want;
-  };
-  std::thread a(rounds, 2, std::cref(circle), &mismatches[0]);
-  std::thread b(rounds, 3, std::cref(viviani), &mismatches[1]);
-  a.join();
-  b.join();
-  EXPECT_EQ(mismatches[0], 0);
-  EXPECT_EQ(mismatches[1], 0);
+  std::vector<int> same(want.size(), 0);
+  std::vector<std::thread> pool;
+  for (std::size_t k = 0; k < want.size(); ++k) {
+    pool.emplace_back([&, k] {
+      for (int round = 0; round < 8; ++round) {
+        Path p = paths[k];
+        p.run();
+        same[k] += p.ierr == 0 && bitsv(p.xt) == bitsv(want[k].xt) && p.number == want[k].number;
+      }
+    });
+  }
+  for (auto& t : pool) t.join();
+  EXPECT_EQ(same, std::vector<int>(want.size(), 8));
+  EXPECT_GT(std::min(want[0].count, want[1].count), 20);
   EXPECT_EQ(orvq7sys_table_live(), live0);
 }
-
-}  // namespace

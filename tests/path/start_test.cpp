@@ -1,156 +1,72 @@
 // tests/path/start_test.cpp -- checks for path/start.cpp: wncini.
-#include <gtest/gtest.h>
-
-#include <cmath>
-#include <cstdint>
-#include <vector>
-
 #include "curves.h"
 
-namespace {
-
-std::int32_t start(PathRecords& r, Curve& c, double eps, const double* xd, const double* box) {
-  return wncini(&c, &r.dim, eval_curve, &eps, xd, box, &r.options, &r.layout, r.pairs, &r.march,
-                &r.tables, &r.itab, &r.ierr);
-}
-
-void release(PathRecords& r) {
+// Starts the path of r on c, then releases what wncini stored: nothing may be left.
+std::int32_t start(PathRecords& r, Curve& c, double eps, const Reals& xd, const Reals& box) {
+  const std::int64_t live0 = orvq7sys_table_live();
+  const std::int32_t result = wncini(&c, &r.dim, eval_curve, &eps, xd.data(), box.data(),
+                                     &r.options, &r.layout, r.pairs, &r.march, &r.tables, &r.itab,
+                                     &r.ierr);
   std::int32_t ierr = -1;
   EXPECT_EQ(yncend(&r.itab, &ierr), 0);
+  EXPECT_EQ(orvq7sys_table_live(), live0);
+  return result;
 }
 
-const double kBox[4] = {-2.0, -2.0, 2.0, 2.0};
+const Reals kBox = {-2.0, -2.0, 2.0, 2.0};
 
 TEST(Wncini, StartsAlongTheGivenDirectionAndStoresTheFirstPoint) {
-  // Unit circle from (1, 0) along d0 = (0, 2); K = 4 (order level 1); kinds 23 and group 1.
-  PathRecords r(2, 4, 2 + 16);
-  ASSERT_EQ(r.result, 0);
-  Curve c(Curve::kCircle, 2);
-  const double xd[4] = {1.0, 0.0, 0.0, 2.0};
-  const std::int64_t live0 = orvq7sys_table_live();
-  ASSERT_EQ(start(r, c, 1e-12, xd, kBox), 0);
-  EXPECT_EQ(r.ierr, 0);
-  EXPECT_EQ(c.reqs, (std::vector<std::int32_t>{1, 6}));  // residuals, then ynumde's req 6
-  const Orvq7PathMarch& m = r.march;
-  EXPECT_EQ(m.sign, 1);  // computed tangent (-0, 1) along d0
-  const double want_x[2] = {1.0, 0.0}, want_t[2] = {0.0, 2.0}, want_c[2] = {-1.0, 0.0};
-  for (int i = 0; i < 2; ++i) {
-    EXPECT_EQ(bits(m.x[i]), bits(want_x[i]));
-    EXPECT_EQ(bits(m.t[i]), bits(want_t[i]));  // d0 itself, not normalised
-    EXPECT_EQ(bits(m.tprev[i]), bits(want_t[i]));
-    EXPECT_DOUBLE_EQ(m.c[i], want_c[i]);  // towards the centre, curvature 1
-  }
-  EXPECT_EQ(bits(m.h), bits(1e38));
-  EXPECT_EQ(bits(m.hprev), bits(1e38));
-  EXPECT_EQ(bits(m.f), bits(1.0));
-  EXPECT_EQ(bits(m.g), bits(1.0));
-  EXPECT_EQ(m.nstored, 1);
-  EXPECT_EQ(m.treq, 6);
-  // The result holds the first point: kind 23 = (x, t), group 1 = (phase 0, number 1, x).
-  EXPECT_EQ(orvq7sys_table_live(), live0 + 5);  // master, kind 23, three group members
-  EXPECT_EQ(r.tables.master, r.itab);
-  std::int32_t count = -1;
-  const auto k23 = read_kind(r.itab, 23, &count);
-  ASSERT_EQ(k23.size(), 32u);
-  EXPECT_EQ(count, 0);  // recorded only when the path ends
-  for (int i = 0; i < 2; ++i) {
-    EXPECT_EQ(value_at<double>(k23, i), want_x[i]);
-    EXPECT_EQ(value_at<double>(k23, 2 + i), want_t[i]);
-  }
-  EXPECT_EQ(value_at<std::int32_t>(read_kind(r.itab, 1, &count), 0), 0);
-  EXPECT_EQ(value_at<std::int32_t>(read_kind(r.itab, 2, &count), 0), 1);
-  release(r);
-  EXPECT_EQ(orvq7sys_table_live(), live0);
-  // Against the computed tangent: orientation sign -1, the path still follows d0.
-  PathRecords back(2, 4, 2);
-  const double xd_back[4] = {1.0, 0.0, 0.0, -2.0};
-  ASSERT_EQ(start(back, c, 1e-12, xd_back, kBox), 0);
-  EXPECT_EQ(back.march.sign, -1);
-  EXPECT_EQ(back.march.t[1], -2.0);
-  release(back);
-}
-
-struct StartRefusal {
-  const char* what;
-  double xd[4];
-  double box[4];
-  double eps;
-  std::int32_t ierr;
-  std::size_t evaluations;
-};
-
-class StartChecks : public ::testing::TestWithParam<StartRefusal> {};
-
-TEST_P(StartChecks, RunUnknownByUnknownThenTheResidual) {
-  const StartRefusal& s = GetParam();
-  PathRecords r(2, 4, 2);
-  Curve c(Curve::kCircle, 2);
-  const std::int64_t live0 = orvq7sys_table_live();
-  EXPECT_EQ(start(r, c, s.eps, s.xd, s.box), 1) << s.what;
-  EXPECT_EQ(r.ierr, s.ierr) << s.what;
-  EXPECT_EQ(c.reqs.size(), s.evaluations) << s.what;
-  EXPECT_EQ(r.itab, 0);
-  EXPECT_EQ(orvq7sys_table_live(), live0);
-}
-
-INSTANTIATE_TEST_SUITE_P(
-    Wncini, StartChecks,
-    ::testing::Values(
-        StartRefusal{"bounds out of order", {1, 0, 0, 1}, {2, -2, -2, 2}, 1e-12, 4712, 0},
-        StartRefusal{"equal bounds", {1, 0, 0, 1}, {1, -2, 1, 2}, 1e-12, 4712, 0},
-        StartRefusal{"outside", {1, 0, 0, 1}, {-2, 0.5, 2, 2}, 1e-12, 4712, 0},
-        // Unknown 1 on its lower face, d0 pointing out: 4721 before unknown 2 is looked at.
-        StartRefusal{"face out first", {-2, 9, -1, 0}, {-2, -2, 2, 2}, 1e-12, 4721, 0},
-        StartRefusal{"upper face out", {1, 2, 0, 0.5}, {-2, -2, 2, 2}, 1e-12, 4721, 0},
-        StartRefusal{"outside before face", {5, -2, 0, -1}, {-2, -2, 2, 2}, 1e-12, 4712, 0},
-        // Inside the box but off the circle: residual 0.25^2 above eps.
-        StartRefusal{"off the curve", {1.5, 0, 0, 1}, {-2, -2, 2, 2}, 1e-3, 4712, 1},
-        StartRefusal{"eps not a number", {1, 0, 0, 1}, {-2, -2, 2, 2}, std::nan(""), 4712, 1}));
-
-TEST(Wncini, PointOnAFaceMovingAlongItOrInwardStarts) {
-  PathRecords r(2, 2, 2);  // K = 2: order level 0, c = 0
-  Curve c(Curve::kCircle, 2);
-  const double xd[4] = {0.0, 1.0, 1.0, 0.0};  // on the upper face y = 1, moving along it
-  const double box[4] = {-2.0, -2.0, 2.0, 1.0};
-  ASSERT_EQ(start(r, c, 0.0, xd, box), 0);
-  EXPECT_EQ(c.reqs, (std::vector<std::int32_t>{1, 2}));
-  EXPECT_EQ(bits(r.march.c[0]), bits(0.0));
-  release(r);
-}
-
-TEST(Wncini, NoTangentAtTheStartTakesD0AndTheScaleValues) {
-  // x^2 + y^2 = 0 at the origin: residual 0, gradient 0 (ynumde's 4710 is cleared).
-  // Scale values 2 / ((box(i,2) - box(i,1)) sqrt(2)) for widths 2 and 4.
-  Curve c(Curve::kCircle, 2, 0.0);
-  const double xd[4] = {0.0, 0.0, -3.0, 0.5};
-  const double box[4] = {-1.0, -3.0, 1.0, 1.0};
+  // Unit circle from (1, 0) along d0 = (0, 2), then along -d0; K = 4 (order level 1). The
+  // computed tangent is (-0, 1): orientation sign 1, then -1; c is the curvature vector
+  // (a, b) (2ab F_xy - b^2 F_xx - a^2 F_yy) / (a^2 + b^2)^2 = (-1, -0) at (a, b) = (2, 0).
+  // Then x^2 + y^2 = 0 at the origin: residual 0, gradient 0 (ynumde's 4710 is cleared): d0
+  // is the tangent, c the scale values 2 / ((box(i,2) - box(i,1)) sqrt(2)) for widths 2 and 4,
+  // at order level 1 and 2 (treq 2).
   const double s1 = 2.0 / (2.0 * std::sqrt(2.0)), s2 = 2.0 / (4.0 * std::sqrt(2.0));
-  for (std::int32_t mode : {4, 4 + (1 << 15)}) {  // order level 1, then 2
-    PathRecords r(2, mode, 2);
-    ASSERT_EQ(start(r, c, 0.0, xd, box), 0) << mode;
-    EXPECT_EQ(r.ierr, 0);
-    EXPECT_EQ(r.march.sign, 1);
-    EXPECT_EQ(bits(r.march.t[0]), bits(-3.0));
-    EXPECT_EQ(bits(r.march.c[0]), bits(s1));
-    EXPECT_EQ(bits(r.march.c[1]), bits(s2));
-    EXPECT_EQ(r.march.treq, mode == 4 ? 6 : 2);
-    release(r);
+  struct Case { double p; int mode; Reals xd, box, c; Ints reqs_sign_treq; };
+  const Reals origin = {0, 0, -3, 0.5}, box = {-1, -3, 1, 1};
+  const Case cases[] = {{1, 4, {1, 0, 0, 2}, kBox, {-1, -0.0}, {1, 6, 1, 6}},
+                        {1, 4, {1, 0, 0, -2}, kBox, {-1, -0.0}, {1, 6, -1, 6}},
+                        {0, 4, origin, box, {s1, s2}, {1, 6, 1, 6}},
+                        {0, 4 + (1 << 15), origin, box, {s1, s2}, {1, 2, 1, 2}}};
+  for (const Case& k : cases) {
+    PathRecords r(2, k.mode, 2 + 16);
+    Curve c(Curve::kCircle, 2, k.p);
+    ASSERT_EQ(start(r, c, 1e-12, k.xd, k.box), 0);
+    const Orvq7PathMarch& m = r.march;
+    EXPECT_EQ((Ints{r.ierr, c.reqs[0], c.reqs[1], m.sign, m.treq, m.nstored, r.tables.master != 0}),
+              (Ints{0, 1, k.reqs_sign_treq[1], k.reqs_sign_treq[2], k.reqs_sign_treq[3], 1, 1}));
+    // x0, then d0 itself (not normalised) as tangent and previous tangent, first steps 1e38.
+    EXPECT_EQ(bitsv({m.x[0], m.x[1], m.t[0], m.t[1], m.tprev[0], m.tprev[1], m.h, m.hprev, m.f,
+                     m.g}),
+              bitsv({k.xd[0], k.xd[1], k.xd[2], k.xd[3], k.xd[2], k.xd[3], 1e38, 1e38, 1, 1}));
+    EXPECT_EQ(bitsv(m.c, 2), bitsv(k.c));
   }
 }
 
-TEST(Wncini, FailuresOfTheRoutineAndTheDimensionArePassedOn) {
-  PathRecords r(2, 4, 2);
-  Curve c(Curve::kCircle, 2);
-  const double xd[4] = {1.0, 0.0, 0.0, 1.0};
-  c.fail_code = 4715;  // at the residual evaluation: passed on unchanged
-  EXPECT_EQ(start(r, c, 1e-12, xd, kBox), 1);
-  EXPECT_EQ(r.ierr, 4715);
-  for (std::int32_t n : {1, 21}) {
-    r.dim = n;
-    EXPECT_EQ(start(r, c, 1e-12, xd, kBox), 1);
-    EXPECT_EQ(r.ierr, n == 1 ? 4712 : 4718);
+TEST(Wncini, ChecksRunUnknownByUnknownThenTheResidual) {
+  struct Case { Reals xd, box; double eps; int ierr, evaluations, n = 2, fail_code = 0; };
+  const Reals in = {1, 0, 0, 1};
+  // Bounds out of order, equal, outside; unknown 1 on its lower face with d0 pointing out
+  // (4721 before unknown 2 is looked at), the upper face, outside before the face; on the
+  // upper face y = 1 moving along it: started, residual then tangent (K = 2); off the circle
+  // (residual 0.25^2 above eps), eps not a number; the routine's failure passed on unchanged;
+  // n = 1 and 21.
+  const Case cases[] = {
+      {in, {2, -2, -2, 2}, 1e-12, 4712, 0}, {in, {1, -2, 1, 2}, 1e-12, 4712, 0},
+      {in, {-2, 0.5, 2, 2}, 1e-12, 4712, 0}, {{-2, 9, -1, 0}, kBox, 1e-12, 4721, 0},
+      {{1, 2, 0, 0.5}, kBox, 1e-12, 4721, 0}, {{5, -2, 0, -1}, kBox, 1e-12, 4712, 0},
+      {{0, 1, 1, 0}, {-2, -2, 2, 1}, 0.0, 0, 2}, {{1.5, 0, 0, 1}, kBox, 1e-3, 4712, 1},
+      {in, kBox, NAN, 4712, 1}, {in, kBox, 1e-12, 4715, 1, 2, 4715},
+      {in, kBox, 1e-12, 4712, 0, 1}, {in, kBox, 1e-12, 4718, 0, 21}};
+  for (const Case& k : cases) {
+    PathRecords r(2, 2, 2);
+    Curve c(Curve::kCircle, 2);
+    c.fail_code = k.fail_code, r.dim = k.n;
+    EXPECT_EQ(start(r, c, k.eps, k.xd, k.box), k.ierr == 0 ? 0 : 1);
+    EXPECT_EQ(r.ierr, k.ierr) << k.xd[0] << " " << k.box[0];
+    EXPECT_EQ(int(c.reqs.size()), k.evaluations) << k.xd[0] << " " << k.box[0];
+    EXPECT_EQ(r.itab == 0, k.ierr != 0);
   }
-  EXPECT_EQ(r.itab, 0);
 }
 
-}  // namespace

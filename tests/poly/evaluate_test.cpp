@@ -2,56 +2,41 @@
 #include <gtest/gtest.h>
 
 #include <cmath>
+#include <tuple>
 
 #include "poly/poly_api.h"
 #include "support/recording_services.h"
 
-TEST(Cor, HornerOrderAndEmptyPolynomial) {
-  const double c[3] = {1, 2, 3}, d[3] = {-1, 0, 1};
-  std::int32_t m = 3, zero = 0;
-  double t = 2;
-  EXPECT_EQ(cor(c, &m, &t), 17.0);
-  EXPECT_EQ(cor(nullptr, &zero, &t), 0.0);  // c not read
-  std::int32_t lowest = INT32_MIN;             // m - 1 is not formed for it
-  EXPECT_EQ(bits(cor(nullptr, &lowest, &t)), bits(0.0));
-  // t^2 - 1 at t = 1 + 2^-30 by Horner, (t * t) - 1: 2^-29 + 2^-60 rounds to 2^-29.
-  t = 1 + 0x1p-30;
-  EXPECT_EQ(bits(cor(d, &m, &t)), bits(0x1p-29));
-}
-
-TEST(Derivatives, ValuesAndRangeRules) {
-  const double c[4] = {5, 1, 1, 1}, q[3] = {7, -3, 1};
-  std::int32_t m = 4, two = 2, three = 3, big = 21, zero = 0;
-  double t = 1;
-  EXPECT_EQ(deriv(c, &m, &t), 6.0);   // 1 + 2t + 3t^2
-  EXPECT_EQ(dersec(c, &m, &t), 8.0);  // 2 + 6t
-  EXPECT_EQ(derter(c, &m, &t), 6.0);
-  EXPECT_EQ(deriv(c, &two, &t), 1.0);
-  EXPECT_EQ(derter(c, &three, &t), 0.0);
-  EXPECT_EQ(deriv(nullptr, &big, &t), 0.0);  // outside 2..20: c not read
-  EXPECT_EQ(dersec(nullptr, &zero, &t), 0.0);
-  // dersec has no range check: m = 3 gives 2 c(2) for any t; m = 2 still reads c(1) and
-  // gives 0 times it, -0 for a negative coefficient.
-  t = 123.5;
-  EXPECT_EQ(dersec(q, &three, &t), 2.0);
-  EXPECT_EQ(bits(dersec(q, &two, &t)), bits(-0.0));
-  // No upper limit for dersec and derter: t^24 gives 24*23 t^22 and 24*23*22 t^21.
-  double p[25] = {};
+// cor and its derivatives, bit for bit: Horner order, range rules (c not read), and
+// dersec's and derter's lack of an upper limit.
+TEST(Cor, ValuesDerivativesAndRangeRules) {
+  using Fn = double (*)(const double*, const std::int32_t*, const double*);
+  const double c[4] = {5, 1, 1, 1}, q[3] = {7, -3, 1}, sq[3] = {1, 2, 3}, d[3] = {-1, 0, 1};
+  double p[25] = {};  // t^24: 24*23 t^22 and 24*23*22 t^21
   p[24] = 1;
-  m = 25;
-  t = 0.5;
-  EXPECT_EQ(dersec(p, &m, &t), 552.0 * 0x1p-22);
-  EXPECT_EQ(derter(p, &m, &t), 12144.0 * 0x1p-21);
+  const std::tuple<Fn, const double*, std::int32_t, double, double> cases[] = {
+      {cor, sq, 3, 2, 17.0}, {cor, nullptr, 0, 2, 0.0},
+      {cor, nullptr, INT32_MIN, 2, 0.0},  // m - 1 is not formed for it
+      // t^2 - 1 at t = 1 + 2^-30 by Horner, (t * t) - 1: 2^-29 + 2^-60 rounds to 2^-29.
+      {cor, d, 3, 1 + 0x1p-30, 0x1p-29},
+      {deriv, c, 4, 1, 6.0}, {dersec, c, 4, 1, 8.0}, {derter, c, 4, 1, 6.0},  // 1 + 2t + 3t^2
+      {deriv, c, 2, 1, 1.0}, {derter, c, 3, 1, 0.0},
+      {deriv, nullptr, 21, 1, 0.0}, {dersec, nullptr, 0, 1, 0.0},  // outside 2..20, below 1
+      // dersec: m = 3 gives 2 c(2) for any t; m = 2 still reads c(1) and gives 0 times it,
+      // -0 for a negative coefficient.
+      {dersec, q, 3, 123.5, 2.0}, {dersec, q, 2, 123.5, -0.0},
+      {dersec, p, 25, 0.5, 552.0 * 0x1p-22}, {derter, p, 25, 0.5, 12144.0 * 0x1p-21}};
+  int row = 0;
+  for (auto [f, coef, m, t, want] : cases) {
+    EXPECT_EQ(bits(f(coef, &m, &t)), bits(want)) << "row " << row++;
+  }
 }
 
 TEST(Bernst, SmallCasesAndOutOfRange) {
-  const auto b = [](std::int32_t i, std::int32_t n, double t) { return bernst(&i, &n, &t); };
-  EXPECT_EQ(b(1, 2, 0.5), 0.5);
-  EXPECT_EQ(b(0, 0, 0.37), 1.0);
-  EXPECT_EQ(b(3, 3, 0.75), 0.421875);
-  EXPECT_EQ(b(4, 3, 0.75), 0.0);
-  EXPECT_EQ(b(-1, 3, 0.75), 0.0);
-  EXPECT_EQ(b(0, 20, 0.75), 0.0);
+  const std::tuple<std::int32_t, std::int32_t, double, double> cases[] = {
+      {1, 2, 0.5, 0.5}, {0, 0, 0.37, 1.0},  {3, 3, 0.75, 0.421875},
+      {4, 3, 0.75, 0.0}, {-1, 3, 0.75, 0.0}, {0, 20, 0.75, 0.0}};
+  for (auto [i, n, t, want] : cases) EXPECT_EQ(bernst(&i, &n, &t), want) << i << " " << n;
 }
 
 TEST(Bernst, EveryTabulatedPolynomialMatchesTheProductForm) {

@@ -4,7 +4,9 @@
 #include <gtest/gtest.h>
 
 #include <cmath>
+#include <algorithm>
 #include <complex>
+#include <tuple>
 #include <vector>
 
 #include "poly/poly_api.h"
@@ -35,10 +37,6 @@ struct Case {
   std::vector<double> want;  // (re, im) per slot
   double tol;
 };
-void PrintTo(const Case& k, std::ostream* os) {
-  *os << "solver" << k.solver;
-  for (double c : k.c) *os << "," << c;
-}
 
 std::int32_t solve(const Case& k, double* r) {
   std::int32_t flag = -1, mode = k.solver == kCardan2 ? 2 : 1;
@@ -147,13 +145,12 @@ TEST(Tresor, NewtonNearZeroSignedTestAndHugeCoefficients) {
   std::int32_t code = -1;
   // |c3 / c2| <= 1e-6: itdeg3 from 0; the root near 0 has the sign of -c3, and only a
   // positive one passes the signed convergence test.
-  const double pos[4] = {1, -3, 2, -1e-7}, neg[4] = {1, -3, 2, 1e-7};
-  tresor(pos, r, &code);
-  EXPECT_EQ(code, 0);
-  EXPECT_NEAR(r[0], 5e-8, 1e-14);
-  tresor(neg, r, &code);
-  EXPECT_EQ(code, 11);
-  EXPECT_NEAR(r[0], -5e-8, 1e-14);
+  for (auto [c3, want, root] : {std::tuple{-1e-7, 0, 5e-8}, {1e-7, 11, -5e-8}}) {
+    const double c[4] = {1, -3, 2, c3};
+    tresor(c, r, &code);
+    EXPECT_EQ(code, want);
+    EXPECT_NEAR(r[0], root, 1e-14);
+  }
   const double huge[4] = {1, 0, 6e25, 1};  // |P| = 2e25 >= 1e25
   tresor(huge, r, &code);
   EXPECT_EQ(code, 33);
@@ -164,30 +161,25 @@ TEST(Tresor, NewtonNearZeroSignedTestAndHugeCoefficients) {
 
 TEST(Ynze2r, DoubleRootThresholdAndZeroLeading) {
   // x^2 - 2x + (1 - e): D = e exactly; e = 2^-50 <= 1e-15 gives the double root 1,
-  // e = 2^-49 the roots 1 +- 2^-24.5.
+  // e = 2^-49 the roots 1 +- 2^-24.5; x^2 + 1 the pair +-i.
   double r[6] = {S, S, S, S, S, S};
   std::int32_t err = -1;
   const double below[3] = {1, -2, 1 - 0x1p-50}, above[3] = {1, -2, 1 - 0x1p-49};
-  EXPECT_EQ(ynze2r(below, r, &err), 0);
-  EXPECT_EQ(err, 0);
-  EXPECT_EQ(r[0], 1.0);
-  EXPECT_EQ(r[2], 1.0);
+  EXPECT_EQ(std::pair(ynze2r(below, r, &err), err), std::pair(0, 0));
+  EXPECT_EQ(std::pair(r[0], r[2]), std::pair(1.0, 1.0));
   ynze2r(above, r, &err);
   EXPECT_NEAR(r[0], 1 + 0x1p-25 * std::sqrt(2.0), 1e-15);
   EXPECT_NEAR(r[2], 1 - 0x1p-25 * std::sqrt(2.0), 1e-15);
   const double cpx[3] = {1, 0, 1};
   ynze2r(cpx, r, &err);
-  EXPECT_EQ(r[1], 1.0);
-  EXPECT_EQ(r[3], -1.0);
+  EXPECT_EQ(std::pair(r[1], r[3]), std::pair(1.0, -1.0));
   // Zero leading coefficient: 4709, roots untouched.
   const double lead0[4] = {0, 1, 1, 1};
-  for (double& x : r) x = S;
-  EXPECT_EQ(ynze2r(lead0, r, &err), 1);
-  EXPECT_EQ(err, 4709);
+  std::fill_n(r, 6, S);
+  EXPECT_EQ(std::pair(ynze2r(lead0, r, &err), err), std::pair(1, 4709));
   err = -1;
-  EXPECT_EQ(ynze3r(lead0, r, &err), 1);
-  EXPECT_EQ(err, 4709);
-  for (double x : r) EXPECT_EQ(x, S);
+  EXPECT_EQ(std::pair(ynze3r(lead0, r, &err), err), std::pair(1, 4709));
+  EXPECT_EQ(std::vector<double>(r, r + 6), std::vector<double>(6, S));
 }
 
 struct Dispatch {
@@ -196,10 +188,6 @@ struct Dispatch {
   std::int32_t result, err, nroots;
   std::vector<double> want;
 };
-void PrintTo(const Dispatch& k, std::ostream* os) {
-  *os << "n=" << k.n;
-  for (double c : k.c) *os << "," << c;
-}
 class Ynzenr : public ::testing::TestWithParam<Dispatch> {};
 TEST_P(Ynzenr, DispatchByDegree) {
   const Dispatch& k = GetParam();
