@@ -47,7 +47,8 @@ const Case kCases[] = {
     {'i', 2, rows(2, {1, 2, 3, 4}), {}, 0, rows(2, {-2, 1, 1.5, -0.5})},
     // diag(1, d, 1) by hand: the third step finds d alone; below 1e-15 it stops there, partly
     // transformed; at 1e-15 it goes on and the exchanges of the second step are undone.
-    {'i', 3, {1, 0, 0, 0, kDown15, 0, 0, 0, 1}, {}, 4703, {1, -0.0, 0, -0.0, 1, -0.0, 0, 0, kDown15}},
+    {'i', 3, {1, 0, 0, 0, kDown15, 0, 0, 0, 1}, {}, 4703,
+     {1, -0.0, 0, -0.0, 1, -0.0, 0, 0, kDown15}},
     {'i', 3, {1, 0, 0, 0, d, 0, 0, 0, 1}, {}, 0, {1, 0, -0.0, -0.0, 1 / d, -0.0, 0, -0.0, 1}},
     // Bits from a plain transcription in Python: the first maximum in row-major order, and
     // b(i,j) - (b(i,k) b(k,j)) / p. Column-major ties change most entries; b(i,k) (b(k,j) / p)
@@ -62,7 +63,7 @@ const Case kCases[] = {
     {'d', 2, rows(2, {1, 2, 3, 4}), {}, 0, {-2}},
     // Order 3 expands along the first row (bits of that formula in Python); along the first
     // column the last digit would be ...b44.
-    {'d', 3, rows(3, {0.7, 0.3, -0.3, 2.5, 0.2, 0.1, 2.5, 1.1, 0.7}), {}, 0, {-0x1.1a9fbe76c8b43p+0}},
+    {'d', 3, rows(3, {.7, .3, -.3, 2.5, .2, .1, 2.5, 1.1, .7}), {}, 0, {-0x1.1a9fbe76c8b43p+0}},
     {'d', 4, rows(4, {0, 1, 0, 0, 1, 0, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1}), {}, 0, {-1}},
     {'d', 4, rows(4, {.3, 1.7, -2.9, .11, 5.3, .7, 1.3, -4.1, .3, 1.7, -2.9, .11, 2, 3, 5, 7}), {},
      0, {0}},  // two equal rows

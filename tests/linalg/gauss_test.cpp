@@ -8,91 +8,58 @@
 
 namespace {
 const double kNaN = NAN, kUp = std::nextafter(0.3, 1.0), kUp2 = std::nextafter(2.0, 3.0);
-
-void expect_same(const std::vector<double>& got, const std::vector<double>& want, int t) {
-  for (std::size_t e = 0; e < want.size(); ++e) EXPECT_TRUE(same(got[e], want[e])) << t << ":" << e;
-}
 }  // namespace
 
 TEST(Ynsetr, CodesThresholdsAndNoPivoting) {
-  const struct {
-    std::int32_t n;
-    std::vector<double> d, a, c, r;  // a(1) and c(n) are not read (99)
-    std::int32_t code;
-    std::vector<double> x;  // empty: untouched
-  } cases[] = {
-      // clang-format off
-      {0, {0}, {99}, {99}, {1}, 4712, {}},
-      {2, {0, 1}, {99, 1}, {1, 99}, {1, 1}, 4703, {}},  // regular, but the first pivot is 0
-      {2, {-std::nextafter(1e-15, 0.0), 1}, {99, 1}, {1, 99}, {1, 1}, 4703, {}},  // strict
-      {2, {1e-15, 1}, {99, 1}, {1, 99}, {1, 1}, 0, {0, 1}},  // g = 1/1e-15: x(1) = g - g * 1
-      {2, {2, 2}, {99, 1}, {4, 99}, {3, 1}, 4703, {1.5, 1}},  // beta(2) = 0: x(1) written
+  // a(1) and c(n) are not read (99); x empty: untouched.
+  // clang-format off
+  const struct { std::int32_t n, code; std::vector<double> d, a, c, r, x; } cases[] = {
+      {0, 4712, {0}, {99}, {99}, {1}, {}},
+      {2, 4703, {0, 1}, {99, 1}, {1, 99}, {1, 1}, {}},  // regular, but the first pivot is 0
+      {2, 4703, {-std::nextafter(1e-15, 0.0), 1}, {99, 1}, {1, 99}, {1, 1}, {}},  // strict
+      {2, 0, {1e-15, 1}, {99, 1}, {1, 99}, {1, 1}, {0, 1}},  // g = 1/1e-15: x(1) = g - g * 1
+      {2, 4703, {2, 2}, {99, 1}, {4, 99}, {3, 1}, {1.5, 1}},  // beta(2) = 0: x(1) written
       // 2x1 + 2x2 = 10, 2x1 + 4x2 + 4x3 = -10, -1.5x2 + x3 = -13: every step exact, (1, 4, -7).
-      {3, {2, 4, 1}, {99, 2, -1.5}, {2, 4, 99}, {10, -10, -13}, 0, {1, 4, -7}},
-      // clang-format on
-  };
-  int t = 0;
+      {3, 0, {2, 4, 1}, {99, 2, -1.5}, {2, 4, 99}, {10, -10, -13}, {1, 4, -7}}};
+  // clang-format on
   for (const auto& c : cases) {
     std::int32_t n = c.n, ierr = -1;
     std::vector<double> x = c.r;
-    EXPECT_EQ(ynsetr(&n, c.d.data(), c.a.data(), c.c.data(), x.data(), x.data(), &ierr), !!c.code);
-    EXPECT_EQ(ierr, c.code) << t;
-    expect_same(x, c.x.empty() ? c.r : c.x, t++);
+    const int r = ynsetr(&n, c.d.data(), c.a.data(), c.c.data(), x.data(), x.data(), &ierr);
+    EXPECT_TRUE(r == !!c.code && ierr == c.code) << &c - cases;
+    expect_same(x, c.x.empty() ? c.r : c.x, &c - cases);
   }
 }
 
-TEST(Yntrzr, AbsoluteRelativeAndGapRules) {
-  const struct {
-    std::int32_t n, mode;
-    double tol;
-    std::vector<double> v, w;  // w empty: untouched
-    std::int32_t code;
-  } cases[] = {
-      // clang-format off
-      {0, 0, 0.3, {1}, {}, 4712}, {1, -1, 0.3, {1}, {}, 4718}, {1, 3, 0.3, {1}, {}, 4718},
-      {4, 0, 0.3, {-0.3, kUp, -0x1p-70, 2.5}, {0, kUp, 0, 2.5}, 0},  // inclusive; zeros are +0
-      {4, 2, 0.5, {2, -4, kUp2, -1}, {0, -4, kUp2, 0}, 0},  // limit 0.5 * 4 = 2
-      {3, 2, 0.5, {kNaN, 1, 0.5}, {kNaN, 1, 0}, 0},        // a NaN is never the largest
+TEST(YntrzrYntrnr, CleaningRulesNormsAndCodes) {
+  // yntrzr ('z') and yntrnr ('n') in place; w empty: untouched; the norm nm 9: untouched.
+  // clang-format off
+  struct { char r; std::int32_t n, mode, code; double tol; std::vector<double> v, w; double nm{9}; }
+  cases[] = {
+      {'z', 0, 0, 4712, 0.3, {1}, {}}, {'z', 1, -1, 4718, 0.3, {1}, {}},
+      {'z', 1, 3, 4718, 0.3, {1}, {}},
+      {'z', 4, 0, 0, 0.3, {-0.3, kUp, -0x1p-70, 2.5}, {0, kUp, 0, 2.5}},  // inclusive; zeros are +0
+      {'z', 4, 2, 0, 0.5, {2, -4, kUp2, -1}, {0, -4, kUp2, 0}},  // limit 0.5 * 4 = 2
+      {'z', 3, 2, 0, 0.5, {kNaN, 1, 0.5}, {kNaN, 1, 0}},        // a NaN is never the largest
       // Gap rule on decreasing magnitudes, ties in index order: |previous| * tol > |current|.
-      {3, 1, 1e-15, {1, 1e-20, 0.5}, {1, 0, 0.5}, 0},    // 1, 0.5 | 1e-20
-      {3, 1, 0.5, {0.5, -1, 0.25}, {0.5, -1, 0.25}, 0},  // strict: 1 * 0.5 > 0.5 is false
-      {3, 1, 2.0, {0.5, -0.5, 0.25}, {0.5, 0, 0}, 0},    // the tie keeps index 1 first
-      {3, 1, 2.0, {0.25, -0.5, 0.5}, {0, -0.5, 0}, 0},   // and here index 2
-      // clang-format on
-  };
-  int t = 0;
-  for (const auto& c : cases) {
-    std::int32_t n = c.n, mode = c.mode, ierr = -1;
-    std::vector<double> w = c.v;
-    EXPECT_EQ(yntrzr(&n, w.data(), &c.tol, &mode, w.data(), &ierr), !!c.code) << t;
-    EXPECT_EQ(ierr, c.code) << t;
-    expect_same(w, c.w.empty() ? c.v : c.w, t++);
-  }
-}
-
-TEST(Yntrnr, ThreeNormsZeroVectorAndBadArguments) {
-  const struct {
-    std::int32_t n, mode;
-    std::vector<double> v, w;  // w empty: untouched
-    double norm;               // 9: untouched
-    std::int32_t code;
-  } cases[] = {
-      // clang-format off
-      {2, 0, {3, -4}, {0.75, -1}, 4, 0}, {2, 1, {3, -4}, {3.0 / 7, -4.0 / 7}, 7, 0},
-      {2, 2, {3, -4}, {0.6, -0.8}, 5, 0}, {2, 0, {kNaN, -2}, {kNaN, -1}, 2, 0},
-      {2, 2, {1e200, -1e200}, {0, -0.0}, INFINITY, 0},  // no scaling: the squares overflow
-      {2, 2, {0, -0.0}, {}, 0, 4710}, {2, 7, {3, -4}, {}, 0, 4718}, {0, 7, {3, -4}, {}, 9, 4712},
-      // clang-format on
-  };
-  int t = 0;
+      {'z', 3, 1, 0, 1e-15, {1, 1e-20, 0.5}, {1, 0, 0.5}},    // 1, 0.5 | 1e-20
+      {'z', 3, 1, 0, 0.5, {0.5, -1, 0.25}, {0.5, -1, 0.25}},  // strict: 1 * 0.5 > 0.5 is false
+      {'z', 3, 1, 0, 2.0, {0.5, -0.5, 0.25}, {0.5, 0, 0}},    // the tie keeps index 1 first
+      {'z', 3, 1, 0, 2.0, {0.25, -0.5, 0.5}, {0, -0.5, 0}},   // and here index 2
+      {'n', 2, 0, 0, 0, {3, -4}, {0.75, -1}, 4}, {'n', 2, 1, 0, 0, {3, -4}, {3.0 / 7, -4.0 / 7}, 7},
+      {'n', 2, 2, 0, 0, {3, -4}, {0.6, -0.8}, 5}, {'n', 2, 0, 0, 0, {kNaN, -2}, {kNaN, -1}, 2},
+      {'n', 2, 2, 0, 0, {1e200, -1e200}, {0, -0.0}, INFINITY},  // no scaling: the squares overflow
+      {'n', 2, 2, 4710, 0, {0, -0.0}, {}, 0}, {'n', 2, 7, 4718, 0, {3, -4}, {}, 0},
+      {'n', 0, 7, 4712, 0, {3, -4}, {}, 9}};
+  // clang-format on
   for (const auto& c : cases) {
     std::int32_t n = c.n, mode = c.mode, ierr = -1;
     std::vector<double> w = c.v;
     double norm = 9;
-    EXPECT_EQ(yntrnr(&n, w.data(), &mode, w.data(), &norm, &ierr), !!c.code) << t;
-    EXPECT_EQ(ierr, c.code) << t;
-    EXPECT_EQ(norm, c.norm) << t;
-    expect_same(w, c.w.empty() ? c.v : c.w, t++);
+    const int r = c.r == 'z' ? yntrzr(&n, w.data(), &c.tol, &mode, w.data(), &ierr)
+                             : yntrnr(&n, w.data(), &mode, w.data(), &norm, &ierr);
+    EXPECT_TRUE(r == !!c.code && ierr == c.code && norm == c.nm) << &c - cases;
+    expect_same(w, c.w.empty() ? c.v : c.w, &c - cases);
   }
 }
 
@@ -100,9 +67,8 @@ TEST(Workspace, AboveTheLocalSizesARefusalIs36AndNoBlockIsLeft) {
   // ynsetr above 20 unknowns (4 on the diagonal, 1 beside), yntrzr's gap rule above 100
   // components, ynvvvv from order 11 (columns e2..en, so w = e1): refused, then run.
   std::vector<double> ones(441, 1.0), fours(441, 4.0), v(441), cols, w;
-  for (int i = 0; i < 441; ++i) v[i] = (i % 3 - 1) * (1.0 + i);  // 0 at 1, 4, 7, ...
-  v[1] = 0.1;  // magnitudes ..., 3, 1, 0.1, 0, ...: 1 * 0.25 > 0.1 cuts 0.1 and the zeros
-  const double tol = 0.25;
+  for (int i = 0; i < 441; ++i) v[i] = i == 1 ? 0.1 : (i % 3 - 1) * (1.0 + i);  // 0 at 4, 7, ...
+  const double tol = 0.25;  // magnitudes ..., 3, 1, 0.1, 0, ...: 1 * 0.25 > 0.1 cuts from 0.1
   const std::int32_t mode = 1, local[3] = {20, 100, 10};
   for (int r = 0; r < 3; ++r) {
     for (std::int32_t n : {local[r], local[r] + 1}) {
@@ -115,33 +81,28 @@ TEST(Workspace, AboveTheLocalSizesARefusalIs36AndNoBlockIsLeft) {
                : r == 1 ? yntrzr(&n, v.data(), &tol, &mode, w.data(), ierr)
                         : ynvvvv(&n, cols.data(), w.data(), ierr);
       };
-      std::int32_t ierr = -1;
+      std::int32_t ierr = -1, big = n > local[r];
       WorkspaceWatch ws;
       ws.refuse_next(1);
-      EXPECT_EQ(call(&ierr), n > local[r]);
-      EXPECT_EQ(ierr, n > local[r] ? 36 : 0);
-      EXPECT_EQ(w[0] == -3.0, n > local[r]);
+      EXPECT_TRUE(call(&ierr) == big && ierr == (big ? 36 : 0) && (w[0] == -3.0) == big) << r << n;
       ws.refuse_next(0);
       ASSERT_EQ(call(&ierr), 0);
       EXPECT_TRUE(r == 0 ? std::fabs(4 * w[0] + w[1] - 1) < 1e-14 &&
                                std::fabs(w[n - 2] + 4 * w[n - 1] - 1) < 1e-14
                   : r == 1 ? w[0] == -1 && w[1] == 0 && w[2] == 3 && w[n - 1] == v[n - 1]
                            : w[0] == 1 && w[n - 1] == 0)
-          << r << " " << n;
-      EXPECT_EQ(ws.requests(), n > local[r] ? 2 : 0);
-      EXPECT_EQ(ws.outstanding(), 0);
+          << r << n;
+      EXPECT_TRUE(ws.requests() == 2 * big && ws.outstanding() == 0) << r << n;
     }
   }
   std::int32_t n = 22, ierr = -1;  // ynvvvv above its capacity: 4718 at once, no workspace
   WorkspaceWatch ws;
   w.assign(n, -3.0);
-  EXPECT_EQ(ynvvvv(&n, nullptr, w.data(), &ierr), 1);
-  EXPECT_EQ(ierr, 4718);
-  EXPECT_EQ(w[0], -3.0);
+  EXPECT_TRUE(ynvvvv(&n, nullptr, w.data(), &ierr) == 1 && ierr == 4718 && w[0] == -3.0);
   n = 21;  // ynsetr failing late, a(n) = 0 and d(n) = 1e-16: the block is released
   fours[20] = 1e-16, ones[20] = 0.0;
-  EXPECT_EQ(ynsetr(&n, fours.data(), ones.data(), ones.data(), ones.data(), w.data(), &ierr), 1);
-  EXPECT_EQ(ierr, 4703);
-  EXPECT_EQ(ws.requests(), 1);
-  EXPECT_EQ(ws.outstanding(), 0);
+  EXPECT_TRUE(ynsetr(&n, fours.data(), ones.data(), ones.data(), ones.data(), w.data(), &ierr) ==
+                  1 &&
+              ierr == 4703);
+  EXPECT_TRUE(ws.requests() == 1 && ws.outstanding() == 0);
 }

@@ -4,6 +4,8 @@
 // must agree with these to the bit). Column-major, order n <= 20 (n >= 3 for the inverse,
 // n >= 4 for the determinant); result 0 or 1, outputs written on success only.
 #pragma once
+#include <gtest/gtest.h>
+
 #include <cmath>
 #include <cstdint>
 #include <cstdlib>
@@ -11,9 +13,12 @@
 
 #include "support/recording_services.h"
 
-// Equal bit patterns, or both NaN.
+// Equal bit patterns, or both NaN; and the same for every element of want, traced by t.
 inline bool same(double x, double y) {
   return bits(x) == bits(y) || (std::isnan(x) && std::isnan(y));
+}
+inline void expect_same(const std::vector<double>& got, const std::vector<double>& want, long t) {
+  for (std::size_t e = 0; e < want.size(); ++e) EXPECT_TRUE(same(got[e], want[e])) << t << ":" << e;
 }
 
 // Seed of the randomized checks: ORVQ7_SEED from the environment, else a fixed value.
