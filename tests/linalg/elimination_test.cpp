@@ -14,18 +14,13 @@ const double kDown15 = std::nextafter(1e-15, 0.0), kDown30 = std::nextafter(1e-3
 const double h = 0x1p-53, d = 1e-15;
 const auto rows = by_columns;
 
-struct Case {
-  char routine;  // 's' ynsega with x over b, 'i' ynmimr with b over a, 'd' ynmxmr
-  std::int32_t n;
-  std::vector<double> a, b;  // a by columns
-  std::int32_t code;
-  std::vector<double> want;  // the output; empty: untouched
-};
+// Routine 's' ynsega with x over b, 'i' ynmimr with b over a, 'd' ynmxmr; a by columns; want
+// the output, empty: untouched.
 // clang-format off
+struct Case { char routine; std::int32_t n; std::vector<double> a, b; std::int32_t code;
+              std::vector<double> want; };
 const Case kCases[] = {
-    {'s', 0, {}, {1}, 4712, {}},
-    {'s', 21, {}, {1}, 4718, {}},  // a is not read
-    {'s', 1, {2}, {4}, 0, {2}},
+    {'s', 0, {}, {1}, 4712, {}}, {'s', 21, {}, {1}, 4718, {}} /* a not read */,
     {'s', 1, {1e-30}, {4}, 4703, {}},  // last pivot <= 1e-30 fails, one ulp above passes
     {'s', 1, {-kUp30}, {4}, 0, {4 / -kUp30}},
     {'s', 2, {1e-35, 0, 0, 1e-35}, {1, 1}, 4703, {}},  // the search passes, the last pivot not
@@ -38,8 +33,7 @@ const Case kCases[] = {
     // b(i) - a(i,j) x(j) - ... in place of b(i) - (sum), change the last bits.
     {'s', 3, rows(3, {3, 2, 5, 1, -5, 2, 5, 3, 5}), {0.1, 0.7, 0.3}, 0,
      {0x1.46f61e8a546f6p-3, -0x1.e8a546f61e8a6p-4, -0x1.cbe6d9601cbe5p-6}},
-    {'i', 0, {}, {}, 4712, {}},
-    {'i', 21, {}, {}, 4718, {}},
+    {'i', 0, {}, {}, 4712, {}}, {'i', 21, {}, {}, 4718, {}},
     {'i', 1, {-kDown15}, {}, 4703, {}},  // strict: |a| < 1e-15
     {'i', 1, {1e-15}, {}, 0, {1 / 1e-15}},
     {'i', 2, {1, 0, 0, kDown30}, {}, 4703, {}},  // strict: |det| < 1e-30
@@ -57,8 +51,7 @@ const Case kCases[] = {
      rows(3, {-0x1.68e18cf81b10ep-5, 0x1.5fdbe971e7308p-3, -0x1.20b470c67c0d9p-6,
               -0x1.20b470c67c0d9p-4, 0x1.32bfb7d2e3ce7p-4, 0x1.5fdbe971e7308p-3,
               0x1.cc1f93bc55b59p-3, -0x1.68e18cf81b110p-3, -0x1.c319f03621d53p-4})},
-    {'d', 0, {}, {}, 4712, {}},
-    {'d', 21, {}, {}, 4718, {}},
+    {'d', 0, {}, {}, 4712, {}}, {'d', 21, {}, {}, 4718, {}},
     {'d', 1, {1e-16}, {}, 0, {1e-16}},  // no threshold: a tiny determinant is a result
     {'d', 2, rows(2, {1, 2, 3, 4}), {}, 0, {-2}},
     // Order 3 expands along the first row (bits of that formula in Python); along the first
@@ -88,7 +81,7 @@ TEST(Elimination, CodesThresholdsTieBreaksAndGrouping) {
     std::vector<double> out = c.routine == 's' ? c.b : c.routine == 'i' ? c.a : std::vector{-7.5};
     if (out.empty()) out.assign(441, -7.5);
     const std::vector<double> before = out, &want = c.want.empty() ? before : c.want;
-    const double* a = c.a.empty() ? nullptr : c.a.data();
+    const double* a = c.a.data();  // nullptr when empty: not read
     EXPECT_EQ(c.routine == 's'   ? ynsega(&n, a, out.data(), out.data(), &ierr)
               : c.routine == 'i' ? ynmimr(&n, out.data(), out.data(), &ierr)
                                  : ynmxmr(&n, a, out.data(), &ierr),
@@ -102,9 +95,7 @@ TEST(Elimination, CodesThresholdsTieBreaksAndGrouping) {
 }
 
 TEST(Elimination, AgreesToTheBitWithThePlainTranscriptions) {
-  const std::uint64_t seed = test_seed();
-  SCOPED_TRACE(testing::Message() << "ORVQ7_SEED=" << seed);
-  std::mt19937_64 rng(seed);
+  std::mt19937_64 rng(test_seed());
   std::uniform_real_distribution<double> uniform(-1, 1);
   std::uniform_int_distribution<int> small(-3, 3), pick(0, 40);
   for (int rep = 0; rep < 4000; ++rep) {
@@ -128,6 +119,6 @@ TEST(Elimination, AgreesToTheBitWithThePlainTranscriptions) {
     bool ok = same(det, n >= 4 ? plain::determinant(n, a) : 0.0);
     for (int e = 0; e < n * n; ++e)
       ok = ok && (e >= n || same(x[e], x0[e])) && (inverted || same(inv[e], inv0[e]));
-    ASSERT_TRUE(ok) << "n=" << n << " rep=" << rep;
+    ASSERT_TRUE(ok) << "n=" << n << " rep=" << rep << " ORVQ7_SEED=" << test_seed();
   }
 }

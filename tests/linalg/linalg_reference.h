@@ -68,14 +68,13 @@ inline int solve(int n, Mat a, Mat b, Mat& x) {
     }
   }
   if (std::fabs(a[n * n - 1]) <= 1e-30) return 1;
-  Mat y(n);
-  y[n - 1] = b[n - 1] / a[n * n - 1];
+  b[n - 1] = b[n - 1] / a[n * n - 1];  // b(i) becomes the unknown of column i
   for (int i = n - 2; i >= 0; --i) {
-    double s = a[i + (i + 1) * n] * y[i + 1];
-    for (int j = i + 2; j < n; ++j) s += a[i + j * n] * y[j];
-    y[i] = (b[i] - s) / a[i + i * n];
+    double s = a[i + (i + 1) * n] * b[i + 1];
+    for (int j = i + 2; j < n; ++j) s += a[i + j * n] * b[j];
+    b[i] = (b[i] - s) / a[i + i * n];
   }
-  for (int i = 0; i < n; ++i) x[perm[i]] = y[i];
+  for (int i = 0; i < n; ++i) x[perm[i]] = b[i];
   return 0;
 }
 
