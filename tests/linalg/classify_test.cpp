@@ -67,8 +67,7 @@ TEST(Wnmnm, FlagsTolerancesAndOrders) {
   const double up12 = std::nextafter(1e-12, 1.0);
   // |a11 - 1| < 1e-12: 4503 * 2^-52 = 0.99987e-12 is the identity, 4504 * 2^-52 is not.
   const double in = 1 + 4503 * 0x1p-52, out = 1 + 4504 * 0x1p-52;
-  std::vector<double> z(441, 0.0), tens(20, 1.0);  // ten ones then ten fives: an affinity
-  std::fill(tens.begin() + 10, tens.end(), 5.0);
+  const std::vector<double> z(441, 0.0);
   using Check = std::int32_t (*)(const std::int32_t*, const double*, std::int32_t*, std::int32_t*);
   struct Case {
     Check test;
@@ -95,7 +94,9 @@ TEST(Wnmnm, FlagsTolerancesAndOrders) {
       {wnmnm3, 2, {2e-12, 0, 0, 0}, 0}, {wnmnm3, 2, {1, 0, 1, 0}, 2} /* (x + y, 0) */,
       {wnmnm4, 2, {0.5, 0, 0, 1}, 1} /* lambda 0.5 */, {wnmnm4, 2, {1, 0, 0, 1}, 0} /* no ratio */,
       {wnmnm4, 2, {2, 0, 0, 2}, 0} /* P = 0 */, {wnmnm4, 2, {2, 0, 0, 0.5}, 0} /* 2 and 0.5 */,
-      {wnmnm4, 2, {0, 0, 0, 1}, 0} /* lambda 0 */, {wnmnm4, 20, diag(tens), 1}};
+      {wnmnm4, 2, {0, 0, 0, 1}, 0} /* lambda 0 */,
+      // Ten ones and ten fives on the diagonal: lambda 5, P the projector on the first ten axes.
+      {wnmnm4, 20, diag({1, 1, 1, 1, 1, 1, 1, 1, 1, 1, 5, 5, 5, 5, 5, 5, 5, 5, 5, 5}), 1}};
   // clang-format on
   for (int at : {1, 2, 3, 5, 6, 7}) {  // off the diagonal 1e-12 is "at most", the next is not
     cases.push_back({wnmnm1, 3, diag({2, 2, 2}), 2});
