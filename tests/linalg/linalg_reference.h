@@ -28,7 +28,7 @@ inline std::uint64_t test_seed() {
 }
 
 // Column-major copy of a square matrix of order n written by rows.
-inline std::vector<double> by_columns(int n, std::vector<double> rows) {
+inline std::vector<double> by_rows(int n, std::vector<double> rows) {
   std::vector<double> c(rows.size());
   for (int e = 0; e < n * n; ++e) c[e] = rows[e % n * n + e / n];
   return c;
