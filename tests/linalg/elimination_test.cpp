@@ -53,8 +53,9 @@ const Case kCases[] = {
               -0x1.20b470c67c0d9p-4, 0x1.32bfb7d2e3ce7p-4, 0x1.5fdbe971e7308p-3,
               0x1.cc1f93bc55b59p-3, -0x1.68e18cf81b110p-3, -0x1.c319f03621d53p-4})},
     {'d', 0, {}, {}, 4712, {}}, {'d', 21, {}, {}, 4718, {}},
-    {'d', 1, {1e-16}, {}, 0, {1e-16}},  // no threshold: a tiny determinant is a result
-    {'d', 2, by_rows(2, {1, 2, 3, 4}), {}, 0, {-2}},
+    // No threshold: a tiny determinant is a result; a zero matrix ends at the first step.
+    {'d', 1, {1e-16}, {}, 0, {1e-16}}, {'d', 2, by_rows(2, {1, 2, 3, 4}), {}, 0, {-2}},
+    {'d', 5, std::vector<double>(25), {}, 0, {0}}, {'d', 6, std::vector<double>(36), {}, 0, {0}},
     // Order 3 expands along the first row (bits of that formula in Python); along the first
     // column the last digit would be ...b44.
     {'d', 3, by_rows(3, {.7, .3, -.3, 2.5, .2, .1, 2.5, 1.1, .7}), {}, 0, {-0x1.1a9fbe76c8b43p+0}},
