@@ -138,14 +138,25 @@ void scan_segments(std::int32_t n, const double* x, const double* pts, std::int6
 // operations candidate by candidate, so they give the same results.
 
 #if defined(__x86_64__)
+#if defined(__clang__)
+#pragma clang attribute push(__attribute__((target("avx2"))), apply_to = function)
+#else
 #pragma GCC push_options
 #pragma GCC target("avx2")
+#endif
 namespace lanes {
 
 typedef double V4 __attribute__((vector_size(32)));
 typedef std::int64_t M4 __attribute__((vector_size(32)));  // lane masks: 0 or -1
 
 inline V4 splat(double v) { return V4{v, v, v, v}; }
+
+// Lanes i0..i3 of the eight lanes of (a, b); exact. Clang spells the builtin differently.
+#if defined(__clang__)
+#define LANES_PICK(a, b, i0, i1, i2, i3) __builtin_shufflevector(a, b, i0, i1, i2, i3)
+#else
+#define LANES_PICK(a, b, i0, i1, i2, i3) __builtin_shuffle(a, b, M4{i0, i1, i2, i3})
+#endif
 
 // The coordinates of the four consecutive points at p (layout x y z x y z ...), one vector
 // per axis: three loads, then lanes moved into place.
@@ -157,15 +168,15 @@ struct Points4 {
   __builtin_memcpy(&r0, p, sizeof r0);
   __builtin_memcpy(&r1, p + 4, sizeof r1);
   __builtin_memcpy(&r2, p + 8, sizeof r2);
-  const V4 tx = __builtin_shuffle(r0, r1, M4{0, 3, 6, 7});
-  const V4 ty = __builtin_shuffle(r0, r1, M4{1, 4, 7, 0});
-  const V4 tz = __builtin_shuffle(r0, r1, M4{2, 5, 0, 0});
-  return {__builtin_shuffle(tx, r2, M4{0, 1, 2, 5}), __builtin_shuffle(ty, r2, M4{0, 1, 2, 6}),
-          __builtin_shuffle(tz, r2, M4{0, 1, 4, 7})};
+  const V4 tx = LANES_PICK(r0, r1, 0, 3, 6, 7);
+  const V4 ty = LANES_PICK(r0, r1, 1, 4, 7, 0);
+  const V4 tz = LANES_PICK(r0, r1, 2, 5, 0, 0);
+  return {LANES_PICK(tx, r2, 0, 1, 2, 5), LANES_PICK(ty, r2, 0, 1, 2, 6),
+          LANES_PICK(tz, r2, 0, 1, 4, 7)};
 }
 // Lanes 1..3 of a, then lane 0 of b: the points one further on.
 [[gnu::always_inline]] inline V4 next_lane(const V4& a, const V4& b) {
-  return __builtin_shuffle(a, b, M4{1, 2, 3, 4});
+  return LANES_PICK(a, b, 1, 2, 3, 4);
 }
 
 // Lower bound g of |r| on one axis, where r is the coordinate difference (point of the
@@ -358,7 +369,12 @@ void search3(const double* x, const double* pts, std::int64_t m, double hw, Best
 }
 
 }  // namespace lanes
+#undef LANES_PICK
+#if defined(__clang__)
+#pragma clang attribute pop
+#else
 #pragma GCC pop_options
+#endif
 #endif
 
 template <bool kPolylineMode, bool kBox>

@@ -240,20 +240,242 @@ void fuzz_tests(Input& in, int which) {
   c.quiet();
 }
 
+void fuzz_ynmimr(Input& in) {
+  Args a(in);
+  Call c("ynmimr");
+  const std::int32_t n = in.count(1, 20);
+  const std::size_t sn = n <= 21 ? len(n) : 0, sa = sn * sn;
+  double* m = a.raw(sa);
+  matrix(in, static_cast<std::int32_t>(sn), m);
+  a.seal(m, sa);
+  double* b = a.out(sa);
+  std::int32_t ierr = fuzz::kSentinelInt;
+  const std::int32_t r = ynmimr(a.i32(n), m, b, &ierr);
+  FUZZ_CHECK("ynmimr", one_of(ierr, {0, 4712, 4703, 4718}) && r == (ierr ? 1 : 0));
+  if (n < 1) FUZZ_CHECK("ynmimr", ierr == 4712);
+  if (n > 20) FUZZ_CHECK("ynmimr", ierr == 4718);
+  if (n == 1) FUZZ_CHECK("ynmimr", (ierr == 4703) == (std::fabs(m[0]) < 1e-15));
+  if (n == 2) FUZZ_CHECK("ynmimr", (ierr == 4703) == (std::fabs(m[0] * m[3] - m[1] * m[2]) < 1e-30));
+  if (ierr == 0) FUZZ_CHECK("ynmimr", none_sentinel(b, sa));
+  else if (ierr != 4703 || n <= 2) FUZZ_CHECK("ynmimr", all_sentinel(b, sa));
+  a.check_inputs("ynmimr");
+  c.quiet();
+  if (ierr == 0) {  // b may be a itself
+    std::vector<double> ab(m, m + sa);
+    std::int32_t e2 = -1;
+    ynmimr(&n, ab.data(), ab.data(), &e2);
+    FUZZ_CHECK("ynmimr", e2 == 0);
+    for (std::size_t k = 0; k < sa; ++k) FUZZ_CHECK("ynmimr", same(ab[k], b[k]));
+  }
+}
+
+void fuzz_ynmxmr(Input& in) {
+  Args a(in);
+  Call c("ynmxmr");
+  const std::int32_t n = in.count(1, 20);
+  const std::size_t sn = n <= 20 ? len(n) : 0, sa = sn * sn;
+  double* m = a.raw(sa);
+  matrix(in, static_cast<std::int32_t>(sn), m);
+  a.seal(m, sa);
+  double* det = a.out(1);
+  std::int32_t ierr = fuzz::kSentinelInt;
+  const std::int32_t r = ynmxmr(a.i32(n), m, det, &ierr);
+  FUZZ_CHECK("ynmxmr", ierr == (n < 1 ? 4712 : n > 20 ? 4718 : 0) && r == (ierr ? 1 : 0));
+  FUZZ_CHECK("ynmxmr", fuzz::is_sentinel(*det) == (ierr != 0));
+  if (n == 1) FUZZ_CHECK("ynmxmr", same(*det, m[0]));
+  if (n == 2) {
+    const double want = m[0] * m[3] - m[1] * m[2];
+    FUZZ_CHECK("ynmxmr", same(*det, want) || (std::isnan(*det) && std::isnan(want)));
+  }
+  a.check_inputs("ynmxmr");
+  c.quiet();
+}
+
+// ynmpmm, ynmpmv, ynmrmm: sizes below 1 refused with the output untouched.
+void fuzz_products(Input& in, int which) {
+  static const char* names[3] = {"ynmpmm", "ynmpmv", "ynmrmm"};
+  const char* name = names[which];
+  Args a(in);
+  Call c(name);
+  const std::int32_t m = in.count(1, 5), k = in.count(1, 5), n = in.count(1, 5);
+  const bool ok = m >= 1 && k >= 1 && (which != 0 || n >= 1);
+  const std::size_t sm = ok ? len(m) : 0, sk = ok ? len(k) : 0, sn = ok ? len(n) : 0;
+  std::int32_t ierr = fuzz::kSentinelInt, r = -1;
+  std::size_t so = 0;
+  double* out = nullptr;
+  if (which == 0) {
+    const double *x = a.reals(sm * sk), *y = a.reals(sk * sn);
+    so = sm * sn;
+    out = a.out(so);
+    r = ynmpmm(a.i32(m), a.i32(k), a.i32(n), x, y, out, &ierr);
+  } else if (which == 1) {
+    const double *x = a.reals(sm * sk), *v = a.reals(sk);
+    so = sm;
+    out = a.out(so);
+    r = ynmpmv(a.i32(m), a.i32(k), x, v, out, &ierr);
+  } else {
+    const double* x = a.reals(sm * sk);
+    so = sm * sk;
+    out = a.out(so);
+    r = ynmrmm(a.i32(m), a.i32(k), x, out, &ierr);
+    if (ok)  // B(j,i) = A(i,j)
+      for (std::size_t i = 0; i < sm; ++i)
+        for (std::size_t j = 0; j < sk; ++j) FUZZ_CHECK(name, same(out[j + i * sk], x[i + j * sm]));
+  }
+  FUZZ_CHECK(name, ierr == (ok ? 0 : 4712) && r == (ok ? 0 : 1));
+  FUZZ_CHECK(name, ok ? none_sentinel(out, so) : all_sentinel(out, so));
+  a.check_inputs(name);
+  c.quiet();
+}
+
+void fuzz_ynmtvv(Input& in) {
+  Args a(in);
+  Call c("ynmtvv");
+  const std::int32_t n = in.count(1, 8);
+  const std::size_t sn = len(n);
+  const double *x = a.reals(2 * sn), *d = a.reals(sn);
+  double* y = a.out(2 * sn);
+  std::int32_t ierr = fuzz::kSentinelInt;
+  const std::int32_t r = ynmtvv(a.i32(n), x, d, y, &ierr);
+  // The first crossing pair (strict; a NaN never crosses) stops the widening after it.
+  std::size_t stop = sn;
+  for (std::size_t i = 0; i < sn && stop == sn; ++i)
+    if (x[i] - d[i] > x[sn + i] + d[i]) stop = i;
+  const bool fails = n < 1 || stop < sn;
+  FUZZ_CHECK("ynmtvv", ierr == (fails ? 4712 : 0) && r == (fails ? 1 : 0));
+  for (std::size_t i = 0; i < sn; ++i) {
+    if (n >= 1 && i <= stop) {
+      FUZZ_CHECK("ynmtvv", same(y[i], x[i] - d[i]) && same(y[sn + i], x[sn + i] + d[i]));
+    } else {
+      FUZZ_CHECK("ynmtvv", fuzz::is_sentinel(y[i]) && fuzz::is_sentinel(y[sn + i]));
+    }
+  }
+  a.check_inputs("ynmtvv");
+  c.quiet();
+  std::vector<double> xy(x, x + 2 * sn);  // y may be x
+  std::int32_t e2 = -1;
+  ynmtvv(&n, xy.data(), d, xy.data(), &e2);
+  FUZZ_CHECK("ynmtvv", e2 == ierr);
+  for (std::size_t k = 0; k < 2 * sn; ++k)
+    FUZZ_CHECK("ynmtvv", same(xy[k], fuzz::is_sentinel(y[k]) ? x[k] : y[k]));
+}
+
+void fuzz_vectors(Input& in, int which) {
+  Args a(in);
+  if (which == 0) {
+    Call c("ynvpvv");
+    const std::int32_t n = in.count(1, 8);
+    const std::size_t sn = len(n);
+    const double *u = a.reals(sn), *v = a.reals(sn);
+    double* s = a.out(1);
+    std::int32_t ierr = fuzz::kSentinelInt;
+    const std::int32_t r = ynvpvv(a.i32(n), u, v, s, &ierr);
+    FUZZ_CHECK("ynvpvv", ierr == (n < 1 ? 4712 : 0) && r == (n < 1 ? 1 : 0));
+    if (n >= 1) {  // from the first term, left to right
+      double want = u[0] * v[0];
+      for (std::size_t k = 1; k < sn; ++k) want += u[k] * v[k];
+      FUZZ_CHECK("ynvpvv", same(*s, want) || (std::isnan(*s) && std::isnan(want)));
+    } else {
+      FUZZ_CHECK("ynvpvv", fuzz::is_sentinel(*s));
+    }
+    a.check_inputs("ynvpvv");
+    c.quiet();
+  } else if (which == 1) {
+    Call c("ynvevv");
+    const std::int32_t n = in.count(2, 8);
+    const std::size_t sn = len(n), sw = n >= 2 ? sn * (sn - 1) / 2 : 0;
+    const double *u = a.reals(sn), *v = a.reals(sn);
+    double* w = a.out(sw);
+    std::int32_t ierr = fuzz::kSentinelInt;
+    const std::int32_t r = ynvevv(a.i32(n), u, v, w, &ierr);
+    FUZZ_CHECK("ynvevv", ierr == (n < 2 ? 4712 : 0) && r == (n < 2 ? 1 : 0));
+    std::size_t at = 0;
+    for (std::size_t i = 0; i + 1 < sn && n >= 2; ++i)
+      for (std::size_t j = i + 1; j < sn; ++j, ++at) {
+        const double want = u[i] * v[j] - u[j] * v[i];
+        FUZZ_CHECK("ynvevv", same(w[at], want) || (std::isnan(w[at]) && std::isnan(want)));
+      }
+    a.check_inputs("ynvevv");
+    c.quiet();
+  } else {
+    Call c("ynvvvv");
+    const std::int32_t n = (in.byte() & 3) ? in.count(2, 6) : in.count(10, 21);
+    const std::size_t sn = n <= 22 ? len(n) : 0, sa = sn ? sn * (sn - 1) : 0;
+    double* m = a.raw(sa);
+    for (std::size_t k = 0; k < sa; ++k) m[k] = in.real();
+    if (sa && (in.byte() & 3) == 0) m[sa - 1] = m[sn - 1], m[sa - 2] = m[sn - 2];
+    a.seal(m, sa);
+    double* w = a.out(sn);
+    const bool refuse = (in.byte() & 3) == 0;
+    if (refuse) c.refuse(1);
+    std::int32_t ierr = fuzz::kSentinelInt;
+    const std::int32_t r = ynvvvv(a.i32(n), m, w, &ierr);
+    c.refuse(0);
+    FUZZ_CHECK("ynvvvv", one_of(ierr, {0, 4712, 4718, 36}) && r == (ierr ? 1 : 0));
+    if (n < 2) FUZZ_CHECK("ynvvvv", ierr == 4712);
+    else if (n > 21) FUZZ_CHECK("ynvvvv", ierr == 4718);
+    else if (n >= 11 && refuse) FUZZ_CHECK("ynvvvv", ierr == 36);
+    else FUZZ_CHECK("ynvvvv", ierr == 0);
+    FUZZ_CHECK("ynvvvv", ierr ? all_sentinel(w, sn) : none_sentinel(w, sn));
+    if (n == 2) FUZZ_CHECK("ynvvvv", same(w[0], -m[1]) && same(w[1], m[0]));
+    a.check_inputs("ynvvvv");
+    c.quiet();
+  }
+}
+
+// ynxxlv: the model's coefficients and the extremes of each component recomputed from the
+// candidates 0, the stationary point strictly inside, 1; ties keep the smaller parameter.
+void fuzz_ynxxlv(Input& in) {
+  Args a(in);
+  Call c("ynxxlv");
+  const std::int32_t n = in.count(1, 6);
+  const std::size_t sn = len(n);
+  const double *x0 = a.reals(sn), *d = a.reals(sn), *x1 = a.reals(sn);
+  double *e = a.out(sn), *ext = a.out(2 * sn), *sext = a.out(2 * sn);
+  std::int32_t ierr = fuzz::kSentinelInt;
+  const std::int32_t r = ynxxlv(a.i32(n), x0, d, x1, e, ext, sext, &ierr);
+  FUZZ_CHECK("ynxxlv", ierr == (n < 1 ? 4712 : 0) && r == (n < 1 ? 1 : 0));
+  for (std::size_t i = 0; i < sn; ++i) {
+    const double ei = (x1[i] - x0[i]) - d[i];
+    double lo = x0[i], hi = x0[i], slo = 0.0, shi = 0.0;
+    auto consider = [&](double s, double v) {
+      if (v < lo) lo = v, slo = s;
+      if (v > hi) hi = v, shi = s;
+    };
+    if (ei != 0) {
+      const double s = -d[i] / (2 * ei);
+      if (0 < s && s < 1) consider(s, x0[i] + s * (d[i] + ei * s));
+    }
+    consider(1.0, x1[i]);
+    const double want[5] = {ei, lo, hi, slo, shi};
+    const double got[5] = {e[i], ext[i], ext[sn + i], sext[i], sext[sn + i]};
+    for (int k = 0; k < 5; ++k)
+      FUZZ_CHECK("ynxxlv", same(got[k], want[k]) || (std::isnan(got[k]) && std::isnan(want[k])));
+  }
+  a.check_inputs("ynxxlv");
+  c.quiet();
+}
+
 }  // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
   Input in(data, size);
-  switch (in.byte() % 9) {
+  switch (in.byte() % 19) {
     case 0: fuzz_ynsega(in); break;
     case 1: fuzz_ynsetr(in); break;
     case 2: fuzz_yntrzr(in); break;
     case 3: fuzz_yntrnr(in); break;
     case 4: fuzz_ynmnmr(in); break;
-    default: fuzz_tests(in, 0); break;
+    case 5: fuzz_tests(in, 0); break;
     case 6: fuzz_tests(in, 1); break;
     case 7: fuzz_tests(in, 2); break;
     case 8: fuzz_tests(in, 3); break;
+    case 9: fuzz_ynmimr(in); break;
+    case 10: fuzz_ynmxmr(in); break;
+    case 11: case 12: case 13: fuzz_products(in, in.byte() % 3); break;
+    case 14: fuzz_ynmtvv(in); break;
+    case 18: fuzz_ynxxlv(in); break;
+    default: fuzz_vectors(in, in.byte() % 3); break;
   }
   return 0;
 }

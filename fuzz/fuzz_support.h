@@ -21,9 +21,15 @@
 
 namespace fuzz {
 
-// A broken guarantee: say which and stop (libFuzzer keeps the input as a crash).
+class Args;
+void dump(const Args& a);
+inline thread_local const Args* t_current_args = nullptr;
+
+// A broken guarantee: say which, show the call's input arrays, and stop (libFuzzer keeps the
+// input as a crash).
 [[noreturn]] inline void broken(const char* routine, const char* what, long detail = 0) {
   std::fprintf(stderr, "\n*** %s: %s (%ld)\n", routine, what, detail);
+  if (t_current_args != nullptr) dump(*t_current_args);
   std::fflush(stderr);
   std::abort();
 }
@@ -128,7 +134,8 @@ class Input {
 // call; outputs start as the sentinel.
 class Args {
  public:
-  explicit Args(Input& in) : in_(in) {}
+  explicit Args(Input& in) : in_(in) { t_current_args = this; }
+  ~Args() { t_current_args = nullptr; }
   Args(const Args&) = delete;
   Args& operator=(const Args&) = delete;
 
@@ -180,6 +187,7 @@ class Args {
   }
 
  private:
+  friend void dump(const Args& a);
   struct Kept {
     const double* p;
     std::vector<double> copy;
@@ -204,6 +212,19 @@ class Args {
   std::vector<Kept> reals_;
   std::vector<KeptInt> ints_;
 };
+
+inline void dump(const Args& a) {
+  for (const auto& r : a.ints_) {
+    std::fprintf(stderr, "  int  ");
+    for (std::int32_t v : r.copy) std::fprintf(stderr, " %d", v);
+    std::fprintf(stderr, "\n");
+  }
+  for (const auto& r : a.reals_) {
+    std::fprintf(stderr, "  real ");
+    for (double v : r.copy) std::fprintf(stderr, " %a", v);
+    std::fprintf(stderr, "\n");
+  }
+}
 
 // ---- Checks ------------------------------------------------------------------------------
 

@@ -12,11 +12,22 @@ namespace impl {
 using Lanes = double __attribute__((vector_size(16)));
 using LaneMask = std::int64_t __attribute__((vector_size(16)));
 
-// Unaligned access to two consecutive reals. The vector type aliases double only (unlike a
-// byte copy, which could alias anything and would force every other value to be reloaded).
+// Unaligned access to two consecutive reals. With GCC the vector type of reduced alignment
+// aliases double only (unlike a byte copy, which could alias anything and would force every
+// other value to be reloaded). Clang keeps 16-byte alignment for that type, which would make
+// the access misaligned, so there the access is a 16-byte copy.
+#if defined(__clang__)
+inline Lanes load_lanes(const double* p) {
+  Lanes v;
+  __builtin_memcpy(&v, p, sizeof v);
+  return v;
+}
+inline void store_lanes(double* p, Lanes v) { __builtin_memcpy(p, &v, sizeof v); }
+#else
 using LanesAt = double __attribute__((vector_size(16), aligned(8)));
 inline Lanes load_lanes(const double* p) { return *reinterpret_cast<const LanesAt*>(p); }
 inline void store_lanes(double* p, Lanes v) { *reinterpret_cast<LanesAt*>(p) = v; }
+#endif
 inline Lanes splat(double x) { return Lanes{x, x}; }
 inline LaneMask as_mask(Lanes v) { return __builtin_bit_cast(LaneMask, v); }
 inline Lanes as_lanes(LaneMask m) { return __builtin_bit_cast(Lanes, m); }

@@ -2,6 +2,7 @@
 // then repeats step choice, prediction and correction, tests, classification and storage until
 // an end. The whole path state is this thread's s_ynchem (path/path_state.h).
 #include <cstdint>
+#include <limits>
 
 #include "frame/status.h"
 #include "path/path_api.h"
@@ -82,6 +83,12 @@ extern "C" std::int32_t ynchem(void* ctx, const std::int32_t* n, Orvq7PathFct fc
     if (s.special != 0) s.phase = 2;
     // (4.4) Count; small systems stop past 5000 points (strict).
     if (s.accepted == 1) {
+      // Larger systems have no point limit, but the count (and the stored point numbers) are
+      // 32-bit: a path that reaches 2^31 - 1 points stops there with the same code.
+      if (s.count == std::numeric_limits<std::int32_t>::max()) {
+        *ierr = impl::kErrPointLimit;
+        return failed(itab, ierr);
+      }
       ++s.count;
       if (s.count > kPointLimit && *n <= kSmallSystem) {
         *ierr = impl::kErrPointLimit;

@@ -125,7 +125,11 @@ typedef int32_t (*Orvq7PathFct)(void* ctx, const int32_t* npts, const double* x,
  * correction fails and the step is halved, so such values end the path by collapse); first
  * derivatives that give no tangent at a new point (not finite, or degenerate as at a singular
  * point) do not stop the path: it goes on with the previous tangent; a prediction that is not finite (from d0, or from a step length that
- * is not a number) fails with 4713. No input makes the call loop without end.
+ * is not a number) fails with 4713. The call always ends, but with n >= 5 the number of points
+ * is not limited: a curve that neither closes nor leaves the box (or collapses) is followed
+ * until 2^31 - 1 points have been accepted (4720) or its storage is refused (36). A caller who
+ * wants a tighter bound counts the calls of its evaluation routine and fails it with a code of
+ * its own past the count it allows (ynchem then fails with that code).
  * Result  0 the path ended and the result is in itab, 1 failure
  *   ierr  result  when                                                         itab
  *   0     0       closed, box exit or collapse after at least one step          the result
@@ -141,7 +145,7 @@ typedef int32_t (*Orvq7PathFct)(void* ctx, const int32_t* npts, const double* x,
  *                 a tangent request (its other codes, and 4715 elsewhere, pass)
  *   4713  1       a prediction that is not finite                               0
  *   4720  1       n <= 4 and a 5001st point (counting x0) was accepted; n >= 5   0
- *                 has no limit
+ *                 has no such limit, only the 2^31 - 1 points of the count
  *   4721  1       x0 on a face with d0 pointing out of the box (d0(i) < 0 at     0
  *                 box(i,1), > 0 at box(i,2)); or the path ended with its start
  *                 point alone (the first step collapsed)
@@ -468,8 +472,8 @@ ORVQ7_API int32_t wncgcv(void* ctx, const int32_t* n, Orvq7PathFct fct, const do
  *   p      in   real(n)    the start of the iteration
  *   box    in   real(2,n)  (lower, upper) of each unknown
  *   xnew   out  real(n)    the kept iterate: the last whose residual norm decreased
- *                          strictly, p before any; written on every return but fct's failure
- *                          and the argument errors
+ *                          strictly, p before any; written on every return but the argument
+ *                          errors (also when fct fails)
  *   rnorm  out  real       its residual norm (sum of squares of the n-1 residuals); 1e38 for
  *                          p before its evaluation
  *   ierr   out  int32      status code
