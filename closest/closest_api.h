@@ -58,6 +58,8 @@ ORVQ7_BEGIN_DECLS
  *       sQ2 >= sQ1 (ties make Q2 the upper end). Segment 2 wholly before P1 (upper <= 0) gives
  *       t1 = 0 and t2 at its upper end; wholly beyond P2 (lower >= 1) gives t1 = 1 and t2 at
  *       its lower end, both with code 0; otherwise the middle of the overlap with code 4717.
+ *       The middle is formed from the projections, so for segments parallel only within the
+ *       test above (or by rounding) its parameters may lie slightly outside [0, 1].
  *   (4) Lines: n = 2, 3: t1 = ((d2 x w).(d1 x d2))/X, t2 = ((d1 x w).(d1 x d2))/X, each then
  *       snapped to exactly 0 when |t| <= 1e-15, else to exactly 1 when |1 - t| <= 1e-15.
  *       n >= 4: t1 = (b d - S2 e)/X, t2 = (S1 d - b e)/X, never snapped.
