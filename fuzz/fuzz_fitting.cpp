@@ -9,13 +9,8 @@
 #include "fitting/fitting_api.h"
 #include "fuzz_support.h"
 
+namespace fuzz {
 namespace {
-
-using fuzz::Args;
-using fuzz::Call;
-using fuzz::Input;
-using fuzz::all_sentinel;
-using fuzz::none_sentinel;
 
 const std::string kSolmpr = " SOLMPR;", kClvcpr = " CLVCPR;", kDrmoyn = " DRMOYN;";
 
@@ -50,13 +45,12 @@ Points points(Input& in, Args& a) {
 }
 
 void fuzz_solmpr(Input& in) {
-  Args a(in);
-  Call c("solmpr");
+  Case a(in, "solmpr");
   const Points pts = points(in, a);
   const double* tol = a.reals(1);
   double *g = a.out(3), *s = a.out(6), *l = a.out(3);
   const std::int32_t r = solmpr(pts.p, a.i32(pts.ld), a.i32(pts.n), tol, g, s, l);
-  const auto fr = fuzz::frames();
+  const auto fr = frames();
   FUZZ_CHECK("solmpr", r == 0 || r == 1);
   if (r == 0) {
     FUZZ_CHECK("solmpr", fr.empty() && none_sentinel(g, 3) && none_sentinel(s, 6) && none_sentinel(l, 3));
@@ -67,13 +61,11 @@ void fuzz_solmpr(Input& in) {
     if (pts.size == 0) FUZZ_CHECK("solmpr", all_sentinel(g, 3) && all_sentinel(s, 6));
     else FUZZ_CHECK("solmpr", none_sentinel(g, 3) && none_sentinel(s, 6));
   }
-  a.check_inputs("solmpr");
-  c.released();
+  a.done_released();
 }
 
 void fuzz_clvcpr(Input& in) {
-  Args a(in);
-  Call c("clvcpr");
+  Case a(in, "clvcpr");
   double* s = a.raw(6);
   for (int k = 0; k < 6; ++k) s[k] = in.real();
   if (in.byte() & 1) s[3] = s[4] = s[5] = 0.0;  // diagonal: multiple eigenvalues are near
@@ -81,25 +73,23 @@ void fuzz_clvcpr(Input& in) {
   const double* lambda = (in.byte() & 1) ? a.real(s[in.byte() % 3]) : a.reals(1);
   double* v = a.out(3);
   const std::int32_t r = clvcpr(s, lambda, v);
-  const auto fr = fuzz::frames();
+  const auto fr = frames();
   if (r == 0) {
     FUZZ_CHECK("clvcpr", fr.empty() && none_sentinel(v, 3));
   } else {
     FUZZ_CHECK("clvcpr", r == 1 && all_sentinel(v, 3) && fr.size() == 1);
     FUZZ_CHECK("clvcpr", (fr[0].code == 1 || fr[0].code == 2) && fr[0].name == kClvcpr);
   }
-  a.check_inputs("clvcpr");
-  c.released();
+  a.done_released();
 }
 
 void fuzz_drmoyn(Input& in) {
-  Args a(in);
-  Call c("drmoyn");
+  Case a(in, "drmoyn");
   const Points pts = points(in, a);
   const double* tol = a.reals(1);
   double* line = a.out(6);
   const std::int32_t r = drmoyn(pts.p, a.i32(pts.ld), a.i32(pts.n), tol, line);
-  const auto fr = fuzz::frames();
+  const auto fr = frames();
   if (r == 0) {
     FUZZ_CHECK("drmoyn", fr.empty() && none_sentinel(line, 6));
   } else {
@@ -107,13 +97,11 @@ void fuzz_drmoyn(Input& in) {
     FUZZ_CHECK("drmoyn", fr[1].name == kDrmoyn && (fr[1].code == 1 || fr[1].code == 2));
     FUZZ_CHECK("drmoyn", fr[0].name == (fr[1].code == 1 ? kSolmpr : kClvcpr));
   }
-  a.check_inputs("drmoyn");
-  c.released();
+  a.done_released();
 }
 
 void fuzz_plmoyn(Input& in) {
-  Args a(in);
-  Call c("plmoyn");
+  Case a(in, "plmoyn");
   const Points pts = points(in, a);
   const double* tol = a.reals(1);
   double* o = a.out(5);  // a, b, c, d, e
@@ -121,14 +109,12 @@ void fuzz_plmoyn(Input& in) {
                                 &o[3], &o[4]);
   FUZZ_CHECK("plmoyn", r == 0 || r == 1);
   FUZZ_CHECK("plmoyn", r == 0 ? none_sentinel(o, 5) : all_sentinel(o, 4));
-  for (const auto& f : fuzz::frames()) FUZZ_CHECK("plmoyn", f.name == kSolmpr || f.name == kClvcpr);
-  a.check_inputs("plmoyn");
-  c.released();
+  for (const auto& f : frames()) FUZZ_CHECK("plmoyn", f.name == kSolmpr || f.name == kClvcpr);
+  a.done_released();
 }
 
 void fuzz_ecrdrt(Input& in) {
-  Args a(in);
-  Call c("ecrdrt");
+  Case a(in, "ecrdrt");
   const Points pts = points(in, a);
   const double* line = a.reals(6);
   double* e = a.out(1);
@@ -137,8 +123,7 @@ void fuzz_ecrdrt(Input& in) {
   if (pts.size == 0) FUZZ_CHECK("ecrdrt", *e == 0 && *k == 1);
   FUZZ_CHECK("ecrdrt", *k >= 1 && *k <= std::max(pts.n, 1));
   FUZZ_CHECK("ecrdrt", std::isnan(*e) || *e >= 0);
-  a.check_inputs("ecrdrt");
-  c.quiet();
+  a.done();
 }
 
 }  // namespace
@@ -154,3 +139,5 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
   }
   return 0;
 }
+
+}  // namespace fuzz

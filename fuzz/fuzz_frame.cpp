@@ -11,10 +11,8 @@
 #include "frame/frame_api.h"
 #include "fuzz_support.h"
 
+namespace fuzz {
 namespace {
-
-using fuzz::Call;
-using fuzz::Input;
 
 void fuzz_cbkver(Input& in) {
   Call call("cbkver");
@@ -23,7 +21,7 @@ void fuzz_cbkver(Input& in) {
   const std::int32_t r = cbkver();
   call.released();
   FUZZ_CHECK("cbkver", r == (refuse ? 1 : 0));
-  const auto fr = fuzz::frames();
+  const auto fr = frames();
   if (refuse) {
     FUZZ_CHECK("cbkver", fr.size() == 1 && fr[0].code == 1036 && fr[0].name == "CBKVER  ");
   } else {
@@ -158,7 +156,7 @@ void fuzz_sorts(Input& in) {
         return x < y;
       });
     FUZZ_CHECK("sorr8", sorr8(v.data(), &count) == 0);
-    for (std::size_t k = 0; k < n; ++k) FUZZ_CHECK("sorr8", fuzz::same(v[k], want[k]));
+    for (std::size_t k = 0; k < n; ++k) FUZZ_CHECK("sorr8", same(v[k], want[k]));
   }
   call.quiet();
 }
@@ -174,7 +172,7 @@ void fuzz_trace(Input& in) {
   const std::int32_t code = in.int32(), severity = in.int32();
   bftier(&code, name, len);
   errmsg(&code, &severity);
-  const auto fr = fuzz::frames();
+  const auto fr = frames();
   const std::size_t kept = static_cast<std::size_t>(std::clamp(len, 0, ORVQ7SYS_NAME_MAX));
   FUZZ_CHECK("bftier", fr.size() == 1 && fr[0].code == code);
   FUZZ_CHECK("bftier", fr[0].name == std::string(name, kept));
@@ -193,7 +191,7 @@ void fuzz_trace(Input& in) {
   giuclo(&flag);
   giuclo(&flag);  // a close without an open context does nothing
   FUZZ_CHECK("giufin", r == (status != 0 ? 1 : 0));
-  const auto gf = fuzz::frames();
+  const auto gf = frames();
   FUZZ_CHECK("giufin", gf.size() == (status != 0 ? 1u : 0u));
   if (status != 0) FUZZ_CHECK("giufin", gf[0].code == status && gf[0].name == std::string(name, 8));
   std::memcpy(gmacer, saved, 8);
@@ -214,18 +212,18 @@ struct ModelTable {
 
 // Every service on a handle the model does not hold fails with 4712 and writes nothing.
 void check_unknown(std::int32_t h) {
-  std::int32_t e = fuzz::kSentinelInt, es = fuzz::kSentinelInt, ent = fuzz::kSentinelInt;
+  std::int32_t e = kSentinelInt, es = kSentinelInt, ent = kSentinelInt;
   const std::int32_t one = 1, zero = 0, sel = 3;
   std::int64_t index = -77;
   std::uint8_t buf[4] = {1, 2, 3, 4};
   FUZZ_CHECK("yutinf", yutinf(&h, &es, &ent, &e) == 1 && e == 4712);
-  FUZZ_CHECK("yutinf", es == fuzz::kSentinelInt && ent == fuzz::kSentinelInt);
+  FUZZ_CHECK("yutinf", es == kSentinelInt && ent == kSentinelInt);
   FUZZ_CHECK("yutrea", yutrea(&h, &one, &zero, buf, &e) == 1 && e == 4712);
   FUZZ_CHECK("yutwri", yutwri(&h, &one, &zero, buf, &e) == 1 && e == 4712);
   FUZZ_CHECK("yutmnc", yutmnc(&h, &zero, &e) == 1 && e == 4712);
   FUZZ_CHECK("yuttab", yuttab(&h, &sel, &index, &ent, &e) == 1 && e == 4712 && index == -77);
-  std::int32_t copy = fuzz::kSentinelInt;
-  FUZZ_CHECK("yutcop", yutcop(&h, &copy, &e) == 1 && e == 4712 && copy == fuzz::kSentinelInt);
+  std::int32_t copy = kSentinelInt;
+  FUZZ_CHECK("yutcop", yutcop(&h, &copy, &e) == 1 && e == 4712 && copy == kSentinelInt);
   FUZZ_CHECK("yutend", yutend(&h, &e) == 1 && e == 4712);
   FUZZ_CHECK("orvq7sys_table_capacity", orvq7sys_table_capacity(h) == -1);
 }
@@ -246,7 +244,19 @@ void fuzz_tables(Input& in) {
     const std::uint8_t what = in.byte();
     // A refusal is injected only for a call whose arguments are valid: 36 and nothing changed.
     const bool refuse = (what & 0xe0) == 0xe0;
-    std::int32_t e = fuzz::kSentinelInt;
+    std::int32_t e = kSentinelInt;
+    // Runs a call that may be refused (only with valid arguments); true when it succeeded,
+    // else checks the code (36 refused, 4712 invalid).
+    auto granted = [&](const char* name, bool valid, auto run) {
+      if (refuse && valid) orvq7sys_table_refuse(0, 1);
+      const std::int32_t r = run();
+      orvq7sys_table_refuse(0, 0);
+      if (!valid || refuse) FUZZ_CHECK(name, r == 1 && e == (valid ? 36 : 4712));
+      else FUZZ_CHECK(name, r == 0 && e == 0);
+      return valid && !refuse;
+    };
+    // Every operation but creation and unknown handles works on a table the slot holds.
+    if (m.handle == 0 && what % 9 != 0 && what % 9 != 7) continue;
     switch (what % 9) {
       case 0: {  // create (over a slot the model holds, the old table is released first)
         if (m.handle != 0) {
@@ -256,16 +266,11 @@ void fuzz_tables(Input& in) {
         }
         const std::int32_t esize = in.count(1, 24), entries = in.count(0, 40);
         const bool valid = esize >= 1 && entries >= 0;
-        std::int32_t h = fuzz::kSentinelInt;
-        if (refuse && valid) orvq7sys_table_refuse(0, 1);
-        const std::int32_t r = yutini(&esize, &entries, &h, &e);
-        orvq7sys_table_refuse(0, 0);
-        if (!valid) {
-          FUZZ_CHECK("yutini", r == 1 && e == 4712 && h == fuzz::kSentinelInt);
-        } else if (refuse) {
-          FUZZ_CHECK("yutini", r == 1 && e == 36 && h == fuzz::kSentinelInt);
+        std::int32_t h = kSentinelInt;
+        if (!granted("yutini", valid, [&] { return yutini(&esize, &entries, &h, &e); })) {
+          FUZZ_CHECK("yutini", h == kSentinelInt);
         } else {
-          FUZZ_CHECK("yutini", r == 0 && e == 0 && h > 0);
+          FUZZ_CHECK("yutini", h > 0);
           for (std::int32_t old : released) FUZZ_CHECK("yutini", h != old);
           m.handle = h;
           m.esize = esize;
@@ -274,26 +279,17 @@ void fuzz_tables(Input& in) {
         break;
       }
       case 1: {  // write, possibly past the end
-        if (m.handle == 0) break;
         const std::int32_t first = in.count(1, m.entries() + 1), count = in.count(0, 20);
         const bool valid = first >= 1 && first <= m.entries() + 1 && count >= 0;
         std::vector<std::uint8_t> values(std::size_t(std::max(count, 0)) * std::size_t(m.esize));
         for (auto& b : values) b = in.byte();
-        if (refuse && valid) orvq7sys_table_refuse(0, 1);
-        const std::int32_t r = yutwri(&m.handle, &first, &count, values.data(), &e);
-        orvq7sys_table_refuse(0, 0);
-        if (!valid || refuse) {
-          FUZZ_CHECK("yutwri", r == 1 && e == (valid ? 36 : 4712));
-          break;
-        }
-        FUZZ_CHECK("yutwri", r == 0 && e == 0);
+        if (!granted("yutwri", valid, [&] { return yutwri(&m.handle, &first, &count, values.data(), &e); })) break;
         const std::size_t at = std::size_t(first - 1) * std::size_t(m.esize);
         if (at + values.size() > m.bytes.size()) m.bytes.resize(at + values.size(), 0);
         std::copy(values.begin(), values.end(), m.bytes.begin() + std::ptrdiff_t(at));
         break;
       }
       case 2: {  // read, inside and outside the table
-        if (m.handle == 0) break;
         const std::int32_t first = in.count(1, m.entries() + 1), count = in.count(0, 20);
         const bool valid = first >= 1 && count >= 0 &&
                            std::int64_t(first) + count - 1 <= std::int64_t(m.entries());
@@ -312,28 +308,19 @@ void fuzz_tables(Input& in) {
         break;
       }
       case 3: {  // set the number of entries
-        if (m.handle == 0) break;
         const std::int32_t entries = in.count(0, 60);
         const bool valid = entries >= 0;
-        if (refuse && valid) orvq7sys_table_refuse(0, 1);
-        const std::int32_t r = yutmnc(&m.handle, &entries, &e);
-        orvq7sys_table_refuse(0, 0);
-        if (!valid || refuse) {
-          FUZZ_CHECK("yutmnc", r == 1 && e == (valid ? 36 : 4712));
-          break;
-        }
-        FUZZ_CHECK("yutmnc", r == 0 && e == 0);
+        if (!granted("yutmnc", valid, [&] { return yutmnc(&m.handle, &entries, &e); })) break;
         m.bytes.resize(std::size_t(entries) * std::size_t(m.esize), 0);
         break;
       }
       case 4: {  // direct access: the storage seen through dynar holds the entries
-        if (m.handle == 0) break;
         const std::int32_t sel = in.count(1, 4);
         std::int64_t index = -77;
-        std::int32_t entries = fuzz::kSentinelInt;
+        std::int32_t entries = kSentinelInt;
         const std::int32_t r = yuttab(&m.handle, &sel, &index, &entries, &e);
         if (sel < 1 || sel > 4) {
-          FUZZ_CHECK("yuttab", r == 1 && e == 4712 && index == -77 && entries == fuzz::kSentinelInt);
+          FUZZ_CHECK("yuttab", r == 1 && e == 4712 && index == -77 && entries == kSentinelInt);
           break;
         }
         FUZZ_CHECK("yuttab", r == 0 && e == 0 && entries == m.entries());
@@ -346,25 +333,20 @@ void fuzz_tables(Input& in) {
         break;
       }
       case 5: {  // copy into another slot the model does not hold
-        if (m.handle == 0) break;
         ModelTable* free_slot = nullptr;
         for (auto& c : t) if (c.handle == 0) free_slot = &c;
         if (free_slot == nullptr) break;
-        std::int32_t copy = fuzz::kSentinelInt;
-        if (refuse) orvq7sys_table_refuse(0, 1);
-        const std::int32_t r = yutcop(&m.handle, &copy, &e);
-        orvq7sys_table_refuse(0, 0);
-        if (refuse) {
-          FUZZ_CHECK("yutcop", r == 1 && e == 36 && copy == fuzz::kSentinelInt);
+        std::int32_t copy = kSentinelInt;
+        if (!granted("yutcop", true, [&] { return yutcop(&m.handle, &copy, &e); })) {
+          FUZZ_CHECK("yutcop", copy == kSentinelInt);
           break;
         }
-        FUZZ_CHECK("yutcop", r == 0 && e == 0 && copy > 0 && copy != m.handle);
+        FUZZ_CHECK("yutcop", copy > 0 && copy != m.handle);
         *free_slot = m;
         free_slot->handle = copy;
         break;
       }
       case 6: {  // release
-        if (m.handle == 0) break;
         FUZZ_CHECK("yutend", yutend(&m.handle, &e) == 0 && e == 0);
         released.push_back(m.handle);
         m = ModelTable{};
@@ -380,7 +362,6 @@ void fuzz_tables(Input& in) {
         break;
       }
       default: {  // description
-        if (m.handle == 0) break;
         std::int32_t es = 0, ent = 0;
         FUZZ_CHECK("yutinf", yutinf(&m.handle, &es, &ent, &e) == 0 && e == 0);
         FUZZ_CHECK("yutinf", es == m.esize && ent == m.entries());
@@ -475,3 +456,5 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
   }
   return 0;
 }
+
+}  // namespace fuzz

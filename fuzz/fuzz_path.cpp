@@ -13,14 +13,8 @@
 #include "path/path_api.h"
 #include "path/path_state.h"
 
+namespace fuzz {
 namespace {
-
-using fuzz::Args;
-using fuzz::Call;
-using fuzz::Input;
-using fuzz::all_sentinel;
-using fuzz::none_sentinel;
-using fuzz::one_of;
 
 // ---- The evaluation routine ---------------------------------------------------------------
 
@@ -128,7 +122,7 @@ System make_system(Input& in, std::int32_t n, const double* x0) {
 
 struct Records {
   Orvq7PathOptions options{};
-  double limits[2] = {fuzz::sentinel(), fuzz::sentinel()};
+  double limits[2] = {sentinel(), sentinel()};
   Orvq7PathLayout layout{};
   std::int32_t pairs[22] = {};
   Orvq7PathMarch march{};
@@ -137,6 +131,24 @@ struct Records {
   const double* pas = nullptr;  // as given to wnccmd
   const double* tol = nullptr;
 };
+
+// The mode word: one of the kinds with the flag bits 15 and 16..19 drawn, or any integer.
+std::int32_t mode_word(Input& in, const std::int32_t (&kinds)[4]) {
+  const std::uint8_t f = in.byte();
+  if ((f & 15) == 0) return in.int32();
+  std::int32_t mode = kinds[f >> 6];
+  if (f & 0x10) mode |= 1 << 15;
+  if (f & 0x20) mode |= 1 << (16 + in.pick(0, 3));
+  return mode;
+}
+
+// The tolerances: st of them (one per unknown, or one).
+const double* tolerances(Input& in, Args& a, std::size_t st) {
+  double* tol = a.raw(st);
+  for (std::size_t i = 0; i < st; ++i) tol[i] = (in.byte() & 7) ? 1e-3 * (1 + in.pick(0, 99)) : in.real();
+  a.seal(tol, st);
+  return tol;
+}
 
 // wnccmd with arguments decoded from the input; returns its code.
 std::int32_t options(Input& in, Args& a, std::int32_t n, Records& r) {
@@ -147,38 +159,25 @@ std::int32_t options(Input& in, Args& a, std::int32_t n, Records& r) {
     pas[sn + i] = (in.byte() & 15) ? pas[i] * (2 + in.pick(0, 30)) : in.real();
   }
   a.seal(pas, 2 * sn);
-  const std::uint8_t f = in.byte();
-  std::int32_t mode;
-  if ((f & 15) == 0) {
-    mode = in.int32();
-  } else {
-    const std::int32_t kinds[4] = {1, 2, 4, 8};
-    mode = kinds[f >> 6];
-    if (f & 0x10) mode |= 1 << 15;
-    if (f & 0x20) mode |= 1 << (16 + in.pick(0, 3));
-  }
-  const bool per_unknown = mode & (1 << 16);
-  const std::size_t st = per_unknown ? sn : 1;
-  double* tol = a.raw(st);
-  for (std::size_t i = 0; i < st; ++i) tol[i] = (in.byte() & 7) ? 1e-3 * (1 + in.pick(0, 99)) : in.real();
-  a.seal(tol, st);
+  const std::int32_t mode = mode_word(in, {1, 2, 4, 8});
+  const double* tol = tolerances(in, a, (mode & (1 << 16)) ? sn : 1);
   r.pas = pas;
   r.tol = tol;
   const std::uint8_t g = in.byte();
   const std::int32_t store = (g & 15) == 0 ? in.int32() : ((g & 1) ? 2 : 0) | ((g & 2) ? 0x38 : 0) |
                                                              ((g & 4) ? 1 : 0) | ((g & 8) ? 1 << 30 : 0);
   const std::int32_t variant = (in.byte() & 7) ? 1 : in.pick(0, 3);
-  std::int32_t ierr = fuzz::kSentinelInt;
+  std::int32_t ierr = kSentinelInt;
   const std::int32_t res = wnccmd(a.i32(n), pas, a.i32(mode), tol, a.i32(store), a.i32(variant),
                                   &r.options, r.limits, &r.layout, r.pairs, &ierr);
-  FUZZ_CHECK("wnccmd", one_of(ierr, {0, 4712, 4718}) && res == (ierr ? 1 : 0));
+  check_code("wnccmd", res, ierr, {0, 4712, 4718});
   if (n < 2) FUZZ_CHECK("wnccmd", ierr == 4712);
   else if (n > 20) FUZZ_CHECK("wnccmd", ierr == 4718);
   if (n < 2 || n > 20) FUZZ_CHECK("wnccmd", all_sentinel(r.limits, 2));
   if (ierr == 0) {
     FUZZ_CHECK("wnccmd", one_of(r.options.kind, {1, 2, 4, 8}) && r.layout.nused >= 1);
-    FUZZ_CHECK("wnccmd", !fuzz::is_sentinel(r.limits[1]));
-    if (r.options.kind >= 4) FUZZ_CHECK("wnccmd", !fuzz::is_sentinel(r.limits[0]));
+    FUZZ_CHECK("wnccmd", !is_sentinel(r.limits[1]));
+    if (r.options.kind >= 4) FUZZ_CHECK("wnccmd", !is_sentinel(r.limits[0]));
   }
   return ierr;
 }
@@ -188,21 +187,20 @@ struct TableWatch {
   std::int64_t live0 = orvq7sys_table_live();
   ~TableWatch() { orvq7sys_table_refuse(0, 0); }
   void released(const char* routine) const {
-    if (orvq7sys_table_live() != live0) fuzz::broken(routine, "table not released", long(orvq7sys_table_live() - live0));
+    if (orvq7sys_table_live() != live0) broken(routine, "table not released", long(orvq7sys_table_live() - live0));
   }
 };
 
 // ---- A traced path, step by step, through the exported routines ---------------------------
 
 void fuzz_march(Input& in) {
-  Args a(in);
-  Call call("wncini");
+  Case a(in, "wncini");
   TableWatch tables;
   auto r = std::make_unique<Records>();
   const std::int32_t n = (in.byte() & 7) ? in.pick(2, 5) : in.count(2, 20);
   if (options(in, a, n, *r) != 0) {
     a.check_inputs("wnccmd");
-    call.quiet();
+    a.call.quiet();
     return;
   }
   // The start point, its direction and the box.
@@ -216,21 +214,19 @@ void fuzz_march(Input& in) {
     box[sn + i] = xd[i] + ((in.byte() & 7) ? 1 + in.pick(0, 40) / 4.0 : in.real());
   }
   if ((in.byte() & 15) == 0) xd[0] = box[sn];  // on a face
-  a.seal(xd, 2 * sn);
-  a.seal(box, 2 * sn);
+  for (double* v : {xd, box}) a.seal(v, 2 * sn);
   System sys = make_system(in, n, xd);
   const double* eps = a.real((in.byte() & 7) ? 1e-20 : in.real());
   const std::uint8_t faults = in.byte();
   if ((faults & 7) == 0) orvq7sys_table_refuse(in.pick(0, 3), 1);
-  std::int32_t ierr = fuzz::kSentinelInt;
+  std::int32_t ierr = kSentinelInt;
   const std::int32_t res = wncini(&sys, &n, evaluate, eps, xd, box, &r->options, &r->layout,
                                   r->pairs, &r->march, &r->tables, &r->itab, &ierr);
   orvq7sys_table_refuse(0, 0);
   FUZZ_CHECK("wncini", res == (ierr ? 1 : 0));
   FUZZ_CHECK("wncini", one_of(ierr, {0, 4712, 4718, 4721, 36, 4703, kOwnCode}) ||
                            (ierr == sys.fail_code && sys.fail_at != 0));
-  a.check_inputs("wncini");
-  call.quiet();
+  a.done();
   if (ierr != 0) {
     FUZZ_CHECK("wncini", r->itab == 0);
     tables.released("wncini");
@@ -245,12 +241,12 @@ void fuzz_march(Input& in) {
     const std::int32_t variant = (in.byte() & 3) ? 1 : in.pick(0, 3);
     const double h0 = r->march.h, f0 = r->march.f;
     Call pc("wncpas");
-    std::int32_t e = fuzz::kSentinelInt;
+    std::int32_t e = kSentinelInt;
     const std::int32_t pr = wncpas(&n, &variant, &r->options, r->limits, r->tol, r->pas, &r->march, &e);
     FUZZ_CHECK("wncpas", pr == (e ? 1 : 0) && one_of(e, {0, 4712, 4718}));
     if (e != 0) {
-      FUZZ_CHECK("wncpas", fuzz::same(r->march.h, h0) && fuzz::same(r->march.f, f0));
-      const auto fr = fuzz::frames();
+      FUZZ_CHECK("wncpas", same(r->march.h, h0) && same(r->march.f, f0));
+      const auto fr = frames();
       FUZZ_CHECK("wncpas", fr.size() == 1 && fr[0].name == "WNCPAS  " && fr[0].code == e);
       break;
     }
@@ -278,16 +274,16 @@ void fuzz_march(Input& in) {
     fc.quiet();
   }
   // The end of the path: the counts recorded, then every quantity found and read back.
-  std::int32_t e = fuzz::kSentinelInt;
+  std::int32_t e = kSentinelInt;
   const std::int32_t two = 2, none = 0;
   const std::int32_t end = wncflu(&two, &none, &r->options, &r->layout, &r->march, &r->tables, &r->itab, &e);
   FUZZ_CHECK("wncflu", end == 0 || !intact);
   const std::int32_t kinds[7] = {22, 23, 43, 1, 2, 3, 99};
   for (std::int32_t kind : kinds) {
     Call yc("yncrea");
-    std::int32_t handle = fuzz::kSentinelInt, count = fuzz::kSentinelInt;
+    std::int32_t handle = kSentinelInt, count = kSentinelInt;
     const std::int32_t yr = yncrea(&r->itab, &kind, &handle, &count, &e);
-    const auto fr = fuzz::frames();
+    const auto fr = frames();
     if (!intact) {
       yc.released();
       continue;
@@ -299,7 +295,7 @@ void fuzz_march(Input& in) {
         FUZZ_CHECK("yncrea", yutinf(&handle, &esize, &entries, &e) == 0 && entries == count);
       }
     } else {
-      FUZZ_CHECK("yncrea", e == 4712 && handle == fuzz::kSentinelInt && count == fuzz::kSentinelInt);
+      FUZZ_CHECK("yncrea", e == 4712 && handle == kSentinelInt && count == kSentinelInt);
       FUZZ_CHECK("yncrea", fr.size() == 1 && fr[0].name == " YNCREA " && fr[0].code == 4712);
     }
     if (kind == 23 && r->layout.slot[1].used)  // the points and tangents, when asked for
@@ -314,8 +310,7 @@ void fuzz_march(Input& in) {
 // ---- ynumde on its own ----------------------------------------------------------------------
 
 void fuzz_ynumde(Input& in) {
-  Args a(in);
-  Call call("ynumde");
+  Case a(in, "ynumde");
   const std::int32_t n = in.count(2, 20), npts = in.count(1, 4);
   const std::int32_t reqs[4] = {2, 4, 6, 1};
   const std::int32_t req = (in.byte() & 7) ? reqs[in.byte() & 3] : in.int32();
@@ -326,11 +321,11 @@ void fuzz_ynumde(Input& in) {
   double x0[21] = {};
   System sys = make_system(in, sn >= 2 ? n : 2, x0);
   const bool refuse = (in.byte() & 7) == 0;
-  if (refuse) call.refuse(1);
-  std::int32_t ierr = fuzz::kSentinelInt;
+  if (refuse) a.call.refuse(1);
+  std::int32_t ierr = kSentinelInt;
   const std::int32_t res = ynumde(&sys, a.i32(n), evaluate, a.i32(npts), x, a.i32(req), out, &ierr);
   a.i32(ierr);  // shown with the arguments when a check fails
-  call.refuse(0);
+  a.call.refuse(0);
   FUZZ_CHECK("ynumde", res == (ierr ? 1 : 0) && sys.calls <= 1);
   FUZZ_CHECK("ynumde", one_of(ierr, {0, 4712, 4718, 4710, 36, kOwnCode}));
   if (ierr == 4718 && sys.calls == 1) FUZZ_CHECK("ynumde", sys.fail_at == 1 && sys.fail_code == 4715);
@@ -350,15 +345,13 @@ void fuzz_ynumde(Input& in) {
       for (std::size_t i = 0; i < sn; ++i) s += out[p * per + i] * out[p * per + i];
       FUZZ_CHECK("ynumde", std::fabs(s - 1) < 1e-12);
     }
-  a.check_inputs("ynumde");
-  call.quiet();
+  a.done();
 }
 
 // ---- Storage on its own: wncfst, yncrea, yncend on foreign handles ----------------------------
 
 void fuzz_storage(Input& in) {
-  Args a(in);
-  Call call("wncfst");
+  Case a(in, "wncfst");
   TableWatch tables;
   auto r = std::make_unique<Records>();
   const std::int32_t n = in.pick(2, 6);
@@ -366,7 +359,7 @@ void fuzz_storage(Input& in) {
   const std::size_t nv = std::size_t(std::max(r->layout.nvalues, 0));
   const double* values = a.reals(nv ? nv : 1);
   const int points = in.pick(1, 4);
-  std::int32_t e = fuzz::kSentinelInt;
+  std::int32_t e = kSentinelInt;
   for (int p = 0; p < points; ++p) {
     const std::int32_t phase = in.pick(0, 2);
     const bool refuse = (in.byte() & 7) == 0;
@@ -378,16 +371,16 @@ void fuzz_storage(Input& in) {
     if (e == 36) FUZZ_CHECK("wncfst", refuse && r->itab == itab0);
     if (itab0 == 0 && e != 0) tables.released("wncfst");
   }
-  call.quiet();
+  a.call.quiet();
   // Foreign handles: no result, an unknown handle.
   const std::int32_t foreign[2] = {0, 0x7fff1234};
   for (std::int32_t h : foreign) {
     Call yc("yncrea");
     const std::int32_t kind = 23;
-    std::int32_t handle = fuzz::kSentinelInt, count = fuzz::kSentinelInt, e2 = -1;
+    std::int32_t handle = kSentinelInt, count = kSentinelInt, e2 = -1;
     FUZZ_CHECK("yncrea", yncrea(&h, &kind, &handle, &count, &e2) == 1 && e2 != 0);
-    FUZZ_CHECK("yncrea", handle == fuzz::kSentinelInt && count == fuzz::kSentinelInt);
-    for (const auto& f : fuzz::frames()) FUZZ_CHECK("yncrea", f.name == " YNCREA ");
+    FUZZ_CHECK("yncrea", handle == kSentinelInt && count == kSentinelInt);
+    for (const auto& f : frames()) FUZZ_CHECK("yncrea", f.name == " YNCREA ");
     Call ec("yncend");
     std::int32_t e3 = -1;
     FUZZ_CHECK("yncend", yncend(&h, &e3) == (h == 0 ? 0 : 1) && (h == 0) == (e3 == 0));
@@ -401,8 +394,7 @@ void fuzz_storage(Input& in) {
 // ---- The variant checks on records wnccmd filled for the other variant -----------------------
 
 void fuzz_variants(Input& in) {
-  Args a(in);
-  Call call("wnccim");
+  Case a(in, "wnccim");
   auto r = std::make_unique<Records>();
   const std::int32_t n = in.pick(2, 6);
   options(in, a, n, *r);
@@ -410,7 +402,7 @@ void fuzz_variants(Input& in) {
   const std::int32_t dn = dims[in.byte() % 3];
   Orvq7PathOptions o = r->options;
   Orvq7PathLayout l = r->layout;
-  std::int32_t e = fuzz::kSentinelInt;
+  std::int32_t e = kSentinelInt;
   if (in.byte() & 1) {
     const std::int32_t res = wnccex(&dn, &o, &l, &e);
     FUZZ_CHECK("wnccex", res == (e ? 1 : 0) && one_of(e, {0, 4718}));
@@ -421,14 +413,13 @@ void fuzz_variants(Input& in) {
     FUZZ_CHECK("wnccim", res == (e ? 1 : 0) && one_of(e, {0, 4718}));
     if (dn < 2 || dn > 20) FUZZ_CHECK("wnccim", e == 4718);
   }
-  call.quiet();
+  a.call.quiet();
 }
 
 // ---- The driver: a whole path traced by ynchem ----------------------------------------------
 
 void fuzz_ynchem(Input& in) {
-  Args a(in);
-  Call call("ynchem");
+  Case a(in, "ynchem");
   TableWatch tables;
   const std::int32_t n = (in.byte() & 7) ? in.pick(2, 4) : in.count(2, 20);
   const std::size_t sn = n > 0 && n <= 21 ? std::size_t(n) : 0;
@@ -444,23 +435,9 @@ void fuzz_ynchem(Input& in) {
     pas[sn + i] = (in.byte() & 15) ? 0.05 * (1 + in.pick(0, 10)) : in.real();
   }
   if (sn && (in.byte() & 15) == 0) xd[0] = box[sn];  // on a face
-  a.seal(xd, 2 * sn);
-  a.seal(box, 2 * sn);
-  a.seal(pas, 2 * sn);
-  const std::uint8_t f = in.byte();
-  std::int32_t mode;
-  if ((f & 15) == 0) {
-    mode = in.int32();
-  } else {
-    const std::int32_t kinds[4] = {2, 4, 8, 4};
-    mode = kinds[f >> 6];
-    if (f & 0x10) mode |= 1 << 15;
-    if (f & 0x20) mode |= 1 << (16 + in.pick(0, 3));
-  }
-  const std::size_t st = (mode & (1 << 16)) ? sn : 1;
-  double* tol = a.raw(st);
-  for (std::size_t i = 0; i < st; ++i) tol[i] = (in.byte() & 7) ? 1e-3 * (1 + in.pick(0, 99)) : in.real();
-  a.seal(tol, st);
+  for (double* v : {xd, box, pas}) a.seal(v, 2 * sn);
+  const std::int32_t mode = mode_word(in, {2, 4, 8, 4});
+  const double* tol = tolerances(in, a, (mode & (1 << 16)) ? sn : 1);
   const std::uint8_t g = in.byte();
   const std::int32_t store = (g & 15) == 0 ? in.int32() : 2 | ((g & 1) ? 4 : 0) | ((g & 2) ? 8 : 0) |
                                                              ((g & 4) ? 16 : 0) | ((g & 8) ? 64 : 0);
@@ -475,7 +452,7 @@ void fuzz_ynchem(Input& in) {
   const std::uint8_t faults = in.byte();
   if ((faults & 15) == 1) orvq7sys_table_refuse(in.pick(0, 40), 1);
   if ((faults & 15) == 2) orvq7sys_ws_refuse(1);
-  std::int32_t itab = fuzz::kSentinelInt, ierr = fuzz::kSentinelInt;
+  std::int32_t itab = kSentinelInt, ierr = kSentinelInt;
   const std::int32_t res = ynchem(&sys, a.i32(n), evaluate, eps, xd, box, pas, a.i32(mode), tol,
                                   a.i32(store), &itab, &ierr);
   orvq7sys_table_refuse(0, 0);
@@ -483,11 +460,11 @@ void fuzz_ynchem(Input& in) {
   const bool fct_code = sys.failed() && (ierr == sys.fail_code || ierr == kOwnCode);
   FUZZ_CHECK("ynchem", res == 0 || res == 1);
   FUZZ_CHECK("ynchem", one_of(ierr, {0, 4712, 4718, 4713, 4720, 4721, 36}) || fct_code);
-  const auto fr = fuzz::frames();
+  const auto fr = frames();
   for (const auto& x : fr)
     FUZZ_CHECK("ynchem", x.name == "YNCHEM  " || x.name == "WNCGOO  " || x.name == "WNCGF2;" ||
                              x.name == "WNCPAS  " || x.name == " YNCREA ");
-  call.released();
+  a.call.released();
   if (res == 1) {
     FUZZ_CHECK("ynchem", itab == 0 && ierr != 0);
     tables.released("ynchem");
@@ -503,7 +480,7 @@ void fuzz_ynchem(Input& in) {
     FUZZ_CHECK("ynchem", yncrea(&itab, &kind, &h, &count, &e) == 0 && count >= 1);
     std::vector<double> xt(2 * sn * std::size_t(count));
     FUZZ_CHECK("ynchem", yutrea(&h, &first, &count, xt.data(), &e) == 0);
-    for (std::size_t i = 0; i < sn; ++i) FUZZ_CHECK("ynchem", fuzz::same(xt[i], xd[i]));
+    for (std::size_t i = 0; i < sn; ++i) FUZZ_CHECK("ynchem", same(xt[i], xd[i]));
     for (std::size_t j = 0; j < std::size_t(count); ++j)
       for (std::size_t i = 0; i < sn; ++i) {
         const double v = xt[j * 2 * sn + i];
@@ -527,7 +504,6 @@ void fuzz_ynchem(Input& in) {
 // a box around x0, step bounds and a march record at (or near) x0. Arrays are sized for n in
 // 1..21 (none otherwise), so that a routine reading past n is seen.
 struct Scene {
-  std::int32_t n = 0;
   std::size_t sn = 0;
   double* xd = nullptr;   // real(n,2): x0, d0
   double* box = nullptr;  // real(n,2): lower, upper
@@ -540,7 +516,6 @@ struct Scene {
 constexpr std::int32_t kExtraCodes[4] = {4716, 4713, 4701, 4702};
 
 void make_scene(Input& in, Args& a, std::int32_t n, const double* pas, Scene& sc) {
-  sc.n = n;
   sc.sn = n >= 1 && n <= 21 ? std::size_t(n) : 0;
   const std::size_t sn = sc.sn;
   const std::int32_t ns = n >= 2 && n <= 20 ? n : 2;
@@ -566,8 +541,7 @@ void make_scene(Input& in, Args& a, std::int32_t n, const double* pas, Scene& sc
     sc.box[i] = x0[i] - ((in.byte() & 7) ? 0.5 + in.pick(0, 40) / 8.0 : in.real());
     sc.box[sn + i] = x0[i] + ((in.byte() & 7) ? 0.5 + in.pick(0, 40) / 8.0 : in.real());
   }
-  a.seal(sc.xd, 2 * sn);
-  a.seal(sc.box, 2 * sn);
+  for (double* v : {sc.xd, sc.box}) a.seal(v, 2 * sn);
   if (pas == nullptr) {
     double* p = a.raw(2 * sn);
     for (std::size_t i = 0; i < sn; ++i) {
@@ -635,7 +609,7 @@ bool only_changed(Orvq7PathMarch before, const Orvq7PathMarch& after, bool f, bo
 bool halved(double f0, double f) {
   if (std::isnan(f0)) return std::isnan(f);
   for (int k = 0; k < 2200; ++k, f0 *= 0.5)
-    if (fuzz::same(f0, f)) return true;
+    if (same(f0, f)) return true;
   return false;
 }
 
@@ -645,7 +619,7 @@ bool on_curve(const System& s, const double* x, double eps) {
 }
 
 // Every frame is the two-unknown corrector's, which only runs for n = 2.
-void only_f2_frames(const char* routine, std::int32_t n, const std::vector<fuzz::Frame>& fr) {
+void only_f2_frames(const char* routine, std::int32_t n, const std::vector<Frame>& fr) {
   for (const auto& f : fr) FUZZ_CHECK(routine, n == 2 && f.name == "WNCGF2;");
 }
 
@@ -665,8 +639,7 @@ double dot_of(std::size_t n, const double* a, const double* b) {
 // ---- Prediction and correction: wncgoo, wncgcv, wncgnn, wncgnr, wncgf2 ----------------------
 
 void fuzz_newton(Input& in) {
-  Args a(in);
-  Call call("wncgoo");
+  Case a(in, "wncgoo");
   const std::int32_t routine = in.byte() % 5;
   const std::int32_t n = routine == 4 ? 2 : (in.byte() & 7) ? in.pick(2, 5) : in.count(2, 20);
   auto sc = std::make_unique<Scene>();
@@ -677,23 +650,23 @@ void fuzz_newton(Input& in) {
   sys.max_calls = routine == 0 ? 4000 : 400;
   const double* eps = a.real((in.byte() & 7) ? ((in.byte() & 1) ? 1e-20 : 1e-12) : in.real());
   const bool bad_n = n < 2 || n > 20;
-  std::int32_t ierr = fuzz::kSentinelInt;
+  std::int32_t ierr = kSentinelInt;
   double* xnew = a.out(sn);
   if (routine == 0) {  // wncgoo
     const Orvq7PathMarch before = sc->march;
     const double* spare = a.real(in.real());
-    std::int32_t special = fuzz::kSentinelInt;
+    std::int32_t special = kSentinelInt;
     const std::int32_t res = wncgoo(&sys, &n, evaluate, eps, spare, sc->pas, &sc->march, &special, xnew, &ierr);
     a.i32(ierr);
     FUZZ_CHECK("wncgoo", res == (ierr ? 1 : 0));
     FUZZ_CHECK("wncgoo", code_ok(ierr, sys, {0, 4712, 4718, 4713}));
-    const auto fr = fuzz::frames();
+    const auto fr = frames();
     if (bad_n) {
       FUZZ_CHECK("wncgoo", ierr == (n < 2 ? 4712 : 4718) && fr.empty() && sys.calls == 0);
-      FUZZ_CHECK("wncgoo", special == fuzz::kSentinelInt && all_sentinel(xnew, sn) && same_march(before, sc->march));
+      FUZZ_CHECK("wncgoo", special == kSentinelInt && all_sentinel(xnew, sn) && same_march(before, sc->march));
     } else {
       FUZZ_CHECK("wncgoo", only_changed(before, sc->march, true, false) && halved(before.f, sc->march.f));
-      std::vector<fuzz::Frame> below = fr;
+      std::vector<Frame> below = fr;
       if (res == 1) {
         FUZZ_CHECK("wncgoo", !fr.empty() && fr.back().name == "WNCGOO  " && fr.back().code == ierr);
         below.pop_back();
@@ -723,7 +696,7 @@ void fuzz_newton(Input& in) {
     const std::int32_t res = wncgcv(&sys, &n, evaluate, eps, &which, uu, xb, p, w, xnew, &ierr);
     a.i32(ierr);
     FUZZ_CHECK("wncgcv", res == (ierr ? 1 : 0));
-    const auto fr = fuzz::frames();
+    const auto fr = frames();
     const bool bad_which = which != 0 && which != 1;
     if (bad_n || bad_which) {
       FUZZ_CHECK("wncgcv", (ierr == 4712 && (n < 2 || bad_which)) || (ierr == 4718 && n > 20));
@@ -775,10 +748,10 @@ void fuzz_newton(Input& in) {
     else res = wncgf2(&sys, evaluate, u, p, box, xnew, rnorm, &ierr);
     a.i32(ierr);
     FUZZ_CHECK(name, res == (ierr ? 1 : 0));
-    const auto fr = fuzz::frames();
+    const auto fr = frames();
     if (bad_n) {
       FUZZ_CHECK(name, ierr == (n < 2 ? 4712 : 4718) && sys.calls == 0);
-      FUZZ_CHECK(name, all_sentinel(xnew, sn) && fuzz::is_sentinel(*rnorm));
+      FUZZ_CHECK(name, all_sentinel(xnew, sn) && is_sentinel(*rnorm));
     } else {
       const bool f2 = routine == 4;
       FUZZ_CHECK(name, code_ok(ierr, sys, {0, 4701, 4716, f2 ? 0 : 4702}));
@@ -787,7 +760,7 @@ void fuzz_newton(Input& in) {
       const bool fct_failed = sys.fail_at != 0 && sys.calls == sys.fail_at;
       if (f2) {
         if (fct_failed) {
-          FUZZ_CHECK(name, ierr == sys.fail_code && all_sentinel(xnew, 2) && fuzz::is_sentinel(*rnorm));
+          FUZZ_CHECK(name, ierr == sys.fail_code && all_sentinel(xnew, 2) && is_sentinel(*rnorm));
           if (ierr == 4716) FUZZ_CHECK(name, fr.empty());
           else FUZZ_CHECK(name, fr.size() == 1 && fr[0].name == "WNCGF2;" && fr[0].code == ierr);
         } else if (ierr == 4701) {
@@ -801,11 +774,11 @@ void fuzz_newton(Input& in) {
       }
       // The kept point and its norm: p with 1e38 before any decrease, else the norm at the
       // point (with the linear condition's square first for wncgnr).
-      if (!fct_failed && ierr != fuzz::kSentinelInt && one_of(ierr, {0, 4701, 4702, 4716})) {
-        FUZZ_CHECK(name, none_sentinel(xnew, sn) && !fuzz::is_sentinel(*rnorm));
+      if (!fct_failed && ierr != kSentinelInt && one_of(ierr, {0, 4701, 4702, 4716})) {
+        FUZZ_CHECK(name, none_sentinel(xnew, sn) && !is_sentinel(*rnorm));
         FUZZ_CHECK(name, *rnorm <= 1e38);
         if (*rnorm == 1e38) {
-          if (!f2) for (std::size_t i = 0; i < sn; ++i) FUZZ_CHECK(name, fuzz::same(xnew[i], p[i]));
+          if (!f2) for (std::size_t i = 0; i < sn; ++i) FUZZ_CHECK(name, same(xnew[i], p[i]));
         } else if (!sys.poisoned()) {
           double expect = residual_sum(sys, xnew);
           if (routine == 3) {
@@ -813,15 +786,14 @@ void fuzz_newton(Input& in) {
             for (std::size_t i = 0; i < sn; ++i) lin += u[i] * (xnew[i] - p[i]);
             expect = lin * lin + expect;
           }
-          FUZZ_CHECK(name, fuzz::same(*rnorm, expect));
+          FUZZ_CHECK(name, same(*rnorm, expect));
         }
         if (ierr == 0 && !f2)  // the kept point passed the box test once more
           for (std::size_t i = 0; i < sn; ++i) FUZZ_CHECK(name, box[2 * i] <= xnew[i] && xnew[i] <= box[2 * i + 1]);
       }
     }
   }
-  a.check_inputs("wncgoo");
-  call.released();
+  a.done_released();
   FUZZ_CHECK("fct", orvq7sys_msg_count() == 0);
 }
 
@@ -839,15 +811,14 @@ double closure(const Scene& sc, const double* x) {
 bool on_face(std::size_t n, const double* box, const double* x) {
   bool face = false;
   for (std::size_t i = 0; i < n; ++i) {
-    if (fuzz::same(x[i], box[i]) || fuzz::same(x[i], box[n + i])) face = true;
+    if (same(x[i], box[i]) || same(x[i], box[n + i])) face = true;
     else if (x[i] < box[i] - 1e-12 || x[i] > box[n + i] + 1e-12) return false;
   }
   return face;
 }
 
 void fuzz_wnctop(Input& in) {
-  Args a(in);
-  Call call("wnctop");
+  Case a(in, "wnctop");
   const std::int32_t n = in.count(1, 21);  // no upper bound: 22 is read as given
   const std::size_t sn = n >= 1 ? std::size_t(n) : 0;
   const double* xa = a.reals(sn);
@@ -861,7 +832,7 @@ void fuzz_wnctop(Input& in) {
   }
   a.seal(xb, sn);
   a.seal(box, 2 * sn);
-  std::int32_t face[2] = {fuzz::kSentinelInt, fuzz::kSentinelInt}, ierr = fuzz::kSentinelInt;
+  std::int32_t face[2] = {kSentinelInt, kSentinelInt}, ierr = kSentinelInt;
   double* xout = a.out(sn);
   const std::int32_t res = wnctop(a.i32(n), xa, xb, box, face, xout, &ierr);
   FUZZ_CHECK("wnctop", res == (ierr ? 1 : 0) && one_of(ierr, {0, 4712}));
@@ -880,23 +851,21 @@ void fuzz_wnctop(Input& in) {
     any = true;
   }
   if (res == 1) {
-    FUZZ_CHECK("wnctop", !any && face[0] == fuzz::kSentinelInt && face[1] == fuzz::kSentinelInt);
+    FUZZ_CHECK("wnctop", !any && face[0] == kSentinelInt && face[1] == kSentinelInt);
     FUZZ_CHECK("wnctop", all_sentinel(xout, sn));
   } else {
     FUZZ_CHECK("wnctop", any && (face[0] == 1 || face[0] == 2) && face[1] >= 1 && face[1] <= n);
     const std::size_t k = std::size_t(face[1] - 1);
     const bool low = xb[k] <= box[k];
     FUZZ_CHECK("wnctop", face[0] == (low ? 1 : 2) && (low || xb[k] >= box[sn + k]));
-    FUZZ_CHECK("wnctop", fuzz::same(xout[k], box[face[0] == 1 ? k : sn + k]) && none_sentinel(xout, sn));
+    FUZZ_CHECK("wnctop", same(xout[k], box[face[0] == 1 ? k : sn + k]) && none_sentinel(xout, sn));
     if (!nan_ratio) FUZZ_CHECK("wnctop", k == first_best);
   }
-  a.check_inputs("wnctop");
-  call.quiet();
+  a.done();
 }
 
 void fuzz_wncver(Input& in) {
-  Args a(in);
-  Call call("wncver");
+  Case a(in, "wncver");
   const std::int32_t n = (in.byte() & 7) ? in.pick(2, 5) : in.count(2, 20);
   const std::size_t sn = n >= 1 && n <= 21 ? std::size_t(n) : 0;
   Orvq7PathOptions o{};
@@ -912,10 +881,7 @@ void fuzz_wncver(Input& in) {
   limits[0] = in.real();
   limits[1] = (in.byte() & 7) ? 0.92388 : in.real();
   a.seal(limits, 2);
-  const std::size_t st = o.per_unknown ? sn : 1;
-  double* tol = a.raw(st);
-  for (std::size_t i = 0; i < st; ++i) tol[i] = (in.byte() & 7) ? 1e-3 * (1 + in.pick(0, 99)) : in.real();
-  a.seal(tol, st);
+  const double* tol = tolerances(in, a, o.per_unknown ? sn : 1);
   double* step = a.raw(sn);
   double* t = a.raw(sn);
   double* tnew = a.raw(sn);
@@ -925,20 +891,18 @@ void fuzz_wncver(Input& in) {
     tnew[i] = (in.byte() & 7) ? t[i] + static_cast<std::int8_t>(in.byte()) / 1024.0 : in.real();
     step[i] = (in.byte() & 7) ? len * t[i] : in.real();
   }
-  a.seal(step, sn);
-  a.seal(t, sn);
-  a.seal(tnew, sn);
-  std::int32_t redo = fuzz::kSentinelInt, ierr = fuzz::kSentinelInt;
+  for (double* v : {step, t, tnew}) a.seal(v, sn);
+  std::int32_t redo = kSentinelInt, ierr = kSentinelInt;
   double* dot = a.out(1);
   const std::int32_t res = wncver(&n, step, t, tnew, &o, limits, tol, &redo, dot, &ierr);
   FUZZ_CHECK("wncver", res == (ierr ? 1 : 0) && one_of(ierr, {0, 4712, 4718}));
   FUZZ_CHECK("wncver", std::memcmp(&o, &o0, sizeof o) == 0);
   if (n < 2 || n > 20) {
     FUZZ_CHECK("wncver", ierr == (n < 2 ? 4712 : 4718));
-    FUZZ_CHECK("wncver", redo == fuzz::kSentinelInt && fuzz::is_sentinel(*dot));
+    FUZZ_CHECK("wncver", redo == kSentinelInt && is_sentinel(*dot));
   } else {
     const double d = dot_of(sn, t, tnew);
-    FUZZ_CHECK("wncver", fuzz::same(*dot, d) && one_of(redo, {0, 1, 2}));
+    FUZZ_CHECK("wncver", same(*dot, d) && one_of(redo, {0, 1, 2}));
     const double lim = limits[1];
     const bool turned = (o.flag18 == 1 && std::fabs(d) < lim) || (o.flag18 == 2 && d < lim);
     if (turned) FUZZ_CHECK("wncver", redo == 1);
@@ -954,23 +918,22 @@ void fuzz_wncver(Input& in) {
       FUZZ_CHECK("wncver", redo == (q > 1 ? 2 : 0));
     }
   }
-  a.check_inputs("wncver");
-  call.quiet();
+  a.done();
 }
 
 void fuzz_events(Input& in) {
   const std::int32_t routine = in.byte() % 6;
   if (routine == 2) return fuzz_wnctop(in);
   if (routine == 5) return fuzz_wncver(in);
-  Args a(in);
-  Call call("wnctes");
+  const char* name = routine == 0 ? "wnctes" : routine == 1 ? "wnctfe" : routine == 3 ? "wnctob" : "wnccar";
+  Case a(in, name);
   const std::int32_t n = (in.byte() & 7) ? in.pick(2, 5) : in.count(2, 20);
   const bool bad_n = n < 2 || n > 20;
   auto r = std::make_unique<Records>();
   const double* pas = nullptr;
   if (routine == 4) {  // wnccar reads the options (made for 2 unknowns when n is out of range)
     if (options(in, a, bad_n ? 2 : n, *r) != 0) {
-      call.quiet();
+      a.call.quiet();
       return;
     }
     if (!bad_n) pas = r->pas;
@@ -985,84 +948,70 @@ void fuzz_events(Input& in) {
   const double* xnew = new_point(in, a, *sc);
   Orvq7PathMarch& m = sc->march;
   const Orvq7PathMarch before = m;
-  std::int32_t ierr = fuzz::kSentinelInt;
-  const char* name = routine == 0 ? "wnctes" : routine == 1 ? "wnctfe" : routine == 3 ? "wnctob" : "wnccar";
+  std::int32_t ierr = kSentinelInt;
+  // The result matches the code; n outside 2..20: the argument code, fct not called, the march
+  // record and the outputs untouched; else one of `own` or fct's code. True for a good n.
+  auto settled = [&](std::int32_t res, bool untouched, std::initializer_list<std::int32_t> own) {
+    a.i32(ierr);
+    FUZZ_CHECK(name, res == (ierr ? 1 : 0));
+    if (bad_n) FUZZ_CHECK(name, ierr == (n < 2 ? 4712 : 4718) && sys.calls == 0 && same_march(before, m) && untouched);
+    else FUZZ_CHECK(name, code_ok(ierr, sys, own));
+    return !bad_n;
+  };
   if (routine == 0) {
-    std::int32_t redo = fuzz::kSentinelInt, special = fuzz::kSentinelInt;
+    std::int32_t redo = kSentinelInt, special = kSentinelInt;
     double* xkeep = a.out(sn);
     const std::int32_t res = wnctes(&sys, &n, evaluate, eps, sc->xd, xnew, sc->box, sc->pas, &m, &redo,
                                     xkeep, &special, &ierr);
-    a.i32(ierr);
-    FUZZ_CHECK(name, res == (ierr ? 1 : 0));
-    if (bad_n) {
-      FUZZ_CHECK(name, ierr == (n < 2 ? 4712 : 4718) && sys.calls == 0 && same_march(before, m));
-      FUZZ_CHECK(name, redo == fuzz::kSentinelInt && special == fuzz::kSentinelInt && all_sentinel(xkeep, sn));
-    } else {
-      FUZZ_CHECK(name, code_ok(ierr, sys, {0, 4718, 36}) && only_changed(before, m, true, true));
+    if (settled(res, redo == kSentinelInt && special == kSentinelInt && all_sentinel(xkeep, sn), {0, 4718, 36})) {
+      FUZZ_CHECK(name, only_changed(before, m, true, true));
       if (res == 0) {
-        FUZZ_CHECK(name, fuzz::same(m.close, closure(*sc, xnew)));
-        FUZZ_CHECK(name, one_of(redo, {0, 1}) && one_of(special, {fuzz::kSentinelInt, 0, 1, 2}));
-        if (redo == 1) FUZZ_CHECK(name, special == fuzz::kSentinelInt && all_sentinel(xkeep, sn));
+        FUZZ_CHECK(name, same(m.close, closure(*sc, xnew)));
+        FUZZ_CHECK(name, one_of(redo, {0, 1}) && one_of(special, {kSentinelInt, 0, 1, 2}));
+        if (redo == 1) FUZZ_CHECK(name, special == kSentinelInt && all_sentinel(xkeep, sn));
         if (special == 2)
-          for (std::size_t i = 0; i < sn; ++i) FUZZ_CHECK(name, fuzz::same(xkeep[i], sc->xd[i]));
+          for (std::size_t i = 0; i < sn; ++i) FUZZ_CHECK(name, same(xkeep[i], sc->xd[i]));
         if (special == 1) FUZZ_CHECK(name, redo == 0 && on_face(sn, sc->box, xkeep) && on_curve(sys, xkeep, *eps));
-        if (redo == 0 && (special == 0 || special == fuzz::kSentinelInt))
-          for (std::size_t i = 0; i < sn; ++i) FUZZ_CHECK(name, fuzz::same(xkeep[i], xnew[i]));
-        if (special == 0 && std::isnormal(before.f * 0.5)) FUZZ_CHECK(name, fuzz::same(m.f, before.f));
+        if (redo == 0 && (special == 0 || special == kSentinelInt))
+          for (std::size_t i = 0; i < sn; ++i) FUZZ_CHECK(name, same(xkeep[i], xnew[i]));
+        if (special == 0 && std::isnormal(before.f * 0.5)) FUZZ_CHECK(name, same(m.f, before.f));
       }
     }
   } else if (routine == 1) {
-    std::int32_t hit = fuzz::kSentinelInt;
+    std::int32_t hit = kSentinelInt;
     const std::int32_t res = wnctfe(&sys, &n, evaluate, eps, sc->xd, xnew, sc->pas, &m, &hit, &ierr);
-    a.i32(ierr);
-    FUZZ_CHECK(name, res == (ierr ? 1 : 0));
-    if (bad_n) {
-      FUZZ_CHECK(name, ierr == (n < 2 ? 4712 : 4718) && sys.calls == 0 && same_march(before, m));
-      FUZZ_CHECK(name, hit == fuzz::kSentinelInt);
-    } else {
-      FUZZ_CHECK(name, code_ok(ierr, sys, {0}) && only_changed(before, m, false, res == 0));
+    if (settled(res, hit == kSentinelInt, {0})) {
+      FUZZ_CHECK(name, only_changed(before, m, false, res == 0));
       const double g = closure(*sc, xnew);
       const bool crossing = before.close_prev < 0 && g >= 0;
       if (!crossing) FUZZ_CHECK(name, sys.calls == 0 && res == 0 && hit == 0);
-      if (res == 0) FUZZ_CHECK(name, fuzz::same(m.close, g) && (hit == 0 || (hit == 1 && crossing)));
+      if (res == 0) FUZZ_CHECK(name, same(m.close, g) && (hit == 0 || (hit == 1 && crossing)));
     }
   } else if (routine == 3) {
-    std::int32_t status = fuzz::kSentinelInt;
+    std::int32_t status = kSentinelInt;
     double* xend = a.out(sn);
     const std::int32_t res = wnctob(&sys, &n, evaluate, eps, xnew, sc->box, sc->pas, &m, &status, xend, &ierr);
-    a.i32(ierr);
-    FUZZ_CHECK(name, res == (ierr ? 1 : 0));
-    if (bad_n) {
-      FUZZ_CHECK(name, ierr == (n < 2 ? 4712 : 4718) && sys.calls == 0 && same_march(before, m));
-      FUZZ_CHECK(name, status == fuzz::kSentinelInt && all_sentinel(xend, sn));
-    } else {
-      FUZZ_CHECK(name, code_ok(ierr, sys, {0, 4718, 36}) && only_changed(before, m, true, false));
+    if (settled(res, status == kSentinelInt && all_sentinel(xend, sn), {0, 4718, 36})) {
+      FUZZ_CHECK(name, only_changed(before, m, true, false));
       FUZZ_CHECK(name, sys.calls <= long(n) * 307 + 1);
       if (res == 0) {
         FUZZ_CHECK(name, one_of(status, {0, 1, 2}) && (status == 2) == (before.nstored <= 1));
         if (status == 2) FUZZ_CHECK(name, sys.calls == 0);
-        if (status != 0) FUZZ_CHECK(name, fuzz::same(m.f, before.f * 0.5) && all_sentinel(xend, sn));
+        if (status != 0) FUZZ_CHECK(name, same(m.f, before.f * 0.5) && all_sentinel(xend, sn));
         if (status == 0) {
           double ahead = 0;
           for (std::size_t i = 0; i < sn; ++i) ahead += (xend[i] - before.x[i]) * before.t[i];
-          FUZZ_CHECK(name, fuzz::same(m.f, before.f) && on_face(sn, sc->box, xend) && !(ahead < 0));
+          FUZZ_CHECK(name, same(m.f, before.f) && on_face(sn, sc->box, xend) && !(ahead < 0));
           FUZZ_CHECK(name, on_curve(sys, xend, *eps));
         }
       }
     }
   } else {  // wnccar
     const std::int32_t special0 = (in.byte() & 15) ? in.pick(0, 2) : in.int32();
-    std::int32_t special = special0, redo = fuzz::kSentinelInt, accepted = fuzz::kSentinelInt;
+    std::int32_t special = special0, redo = kSentinelInt, accepted = kSentinelInt;
     const std::int32_t res = wnccar(&sys, &n, evaluate, sc->xd, xnew, sc->pas, &r->options, r->limits,
                                     r->tol, &special, &m, &redo, &accepted, &ierr);
-    a.i32(ierr);
-    FUZZ_CHECK(name, res == (ierr ? 1 : 0));
-    if (bad_n) {
-      FUZZ_CHECK(name, ierr == (n < 2 ? 4712 : 4718) && sys.calls == 0 && same_march(before, m));
-      FUZZ_CHECK(name, redo == fuzz::kSentinelInt && accepted == fuzz::kSentinelInt && special == special0);
-    } else {
-      FUZZ_CHECK(name, code_ok(ierr, sys, {0, 4718, 36}));
-    }
+    settled(res, redo == kSentinelInt && accepted == kSentinelInt && special == special0, {0, 4718, 36});
     if (res == 0) {
       bool beyond_min = false, beyond_max = false;
       for (std::size_t i = 0; i < sn; ++i) {
@@ -1074,25 +1023,24 @@ void fuzz_events(Input& in) {
       FUZZ_CHECK(name, one_of(redo, {0, 1, 2}) && (redo != 2 || r->options.kind == 4));
       if (beyond_max) FUZZ_CHECK(name, redo == 1 && sys.calls == 0);
       if (redo != 0) {
-        FUZZ_CHECK(name, special == 0 && fuzz::same(m.f, 0.75 * before.f) && only_changed(before, m, true, false));
+        FUZZ_CHECK(name, special == 0 && same(m.f, 0.75 * before.f) && only_changed(before, m, true, false));
       } else {
-        FUZZ_CHECK(name, special == special0 && fuzz::same(m.f, before.f));
+        FUZZ_CHECK(name, special == special0 && same(m.f, before.f));
         const double* x = special0 == 2 ? sc->xd : xnew;
         for (std::size_t i = 0; i < sn; ++i)
-          FUZZ_CHECK(name, fuzz::same(m.x[i], x[i]) && fuzz::same(m.tprev[i], before.t[i]));
+          FUZZ_CHECK(name, same(m.x[i], x[i]) && same(m.tprev[i], before.t[i]));
         if (special0 == 2) {
           FUZZ_CHECK(name, sys.calls == 0);
-          for (std::size_t i = 0; i < sn; ++i) FUZZ_CHECK(name, fuzz::same(m.t[i], sc->xd[sn + i]));
+          for (std::size_t i = 0; i < sn; ++i) FUZZ_CHECK(name, same(m.t[i], sc->xd[sn + i]));
         } else {
           FUZZ_CHECK(name, !(dot_of(sn, before.t, m.t) < 0));  // the orientation kept
         }
       }
     }
-    call.quiet();
+    a.call.quiet();
   }
-  if (routine != 4) only_f2_frames(name, n, fuzz::frames());
-  a.check_inputs(name);
-  call.released();
+  if (routine != 4) only_f2_frames(name, n, frames());
+  a.done_released();
   FUZZ_CHECK(name, orvq7sys_msg_count() == 0);
 }
 
@@ -1116,3 +1064,5 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
   }
   return 0;
 }
+
+}  // namespace fuzz

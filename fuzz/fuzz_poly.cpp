@@ -8,27 +8,14 @@
 #include "fuzz_support.h"
 #include "poly/poly_api.h"
 
+namespace fuzz {
 namespace {
 
-using fuzz::Args;
-using fuzz::Call;
-using fuzz::Input;
-using fuzz::all_sentinel;
-using fuzz::none_sentinel;
-using fuzz::one_of;
-using fuzz::same;
-
-void done(const char* name, const Args& a, const Call& c) {
-  a.check_inputs(name);
-  c.quiet();
-}
-
 void fuzz_duos(Input& in) {
-  Args a(in);
-  Call c("duos");
+  Case a(in, "duos");
   const double* k = a.reals(3);
   double* r = a.out(4);
-  std::int32_t flag = fuzz::kSentinelInt;
+  std::int32_t flag = kSentinelInt;
   duos(k, r, &flag);
   FUZZ_CHECK("duos", flag >= 0 && flag <= 4);
   if (k[0] == 0 && k[1] == 0) {
@@ -40,77 +27,68 @@ void fuzz_duos(Input& in) {
   } else if (!std::isnan(k[0]) && !std::isnan(k[1])) {
     FUZZ_CHECK("duos", (flag == 0 || flag == 4) && none_sentinel(r, 4));
   }
-  done("duos", a, c);
+  a.done();
 }
 
 void fuzz_cubics(Input& in, int which) {
-  Args a(in);
+  static const char* names[3] = {"cardan", "tresor", "itdeg3"};
+  Case a(in, names[which]);
   const double* k = a.reals(4);
   double* r = a.out(6);
-  std::int32_t code = fuzz::kSentinelInt;
+  std::int32_t code = kSentinelInt;
   if (which == 0) {
-    Call c("cardan");
     const std::int32_t* mode = a.i32(in.byte() & 1 ? in.pick(1, 2) : in.int32());
     cardan(k, mode, r, &code);
     FUZZ_CHECK("cardan", one_of(code, {1, 2, 3}) && none_sentinel(r, 6));
     if (std::fabs(k[0]) < 1e-15) FUZZ_CHECK("cardan", code == 2);
-    done("cardan", a, c);
   } else if (which == 1) {
-    Call c("tresor");
     tresor(k, r, &code);
     FUZZ_CHECK("tresor", one_of(code, {0, 11, 12, 13, 33}) && none_sentinel(r, 6));
-    done("tresor", a, c);
   } else {
-    Call c("itdeg3");
     const double* start = a.reals(1);
     itdeg3(k, start, r, &code);
     FUZZ_CHECK("itdeg3", one_of(code, {0, 11, 12, 13}) && none_sentinel(r, 6));
     if (code == 12) FUZZ_CHECK("itdeg3", r[0] == 0 && r[1] == 0);
-    done("itdeg3", a, c);
   }
+  a.done();
 }
 
 void fuzz_quartics(Input& in, int which) {
-  Args a(in);
+  Case a(in, which == 0 ? "ferari" : "quadr");
   const double* k = a.reals(5);
   double* r = a.out(8);
-  std::int32_t flag = fuzz::kSentinelInt;
+  std::int32_t flag = kSentinelInt;
   if (which == 0) {
-    Call c("ferari");
     ferari(k, r, &flag);
     FUZZ_CHECK("ferari", flag == (std::fabs(k[0]) < 1e-15 ? 3 : 0));
     FUZZ_CHECK("ferari", flag == 3 ? all_sentinel(r, 8) : none_sentinel(r, 8));
-    done("ferari", a, c);
   } else {
-    Call c("quadr");
     quadr(k, r, &flag);
     FUZZ_CHECK("quadr", one_of(flag, {0, 1, 2, 3, 4, 11, 12, 13, 33}));
     FUZZ_CHECK("quadr", (flag == 3) == (k[0] == 0));
     if (flag == 3) FUZZ_CHECK("quadr", all_sentinel(r, 8));
-    done("quadr", a, c);
   }
+  a.done();
 }
 
 void fuzz_ynze(Input& in, int which) {
-  Args a(in);
   const char* name = which == 0 ? "ynze2r" : "ynze3r";
-  Call c(name);
+  Case a(in, name);
   const std::size_t nc = which == 0 ? 3 : 4, nr = which == 0 ? 4 : 6;
   const double* k = a.reals(nc);
   double* r = a.out(nr);
-  std::int32_t err = fuzz::kSentinelInt;
+  std::int32_t err = kSentinelInt;
   const std::int32_t res = which == 0 ? ynze2r(k, r, &err) : ynze3r(k, r, &err);
   if (k[0] == 0) {
     FUZZ_CHECK(name, res == 1 && err == 4709 && all_sentinel(r, nr));
   } else {
     FUZZ_CHECK(name, res == 0 && err == 0 && none_sentinel(r, nr));
   }
-  done(name, a, c);
+  a.done();
 }
 
 void fuzz_ynzenr(Input& in) {
-  Args a(in);
-  Call c("ynzenr");
+  Case a(in, "ynzenr");
   const std::int32_t n = in.count(1, 4);
   const std::size_t nc = n >= 0 ? std::size_t(n) + 1 : 0;
   const std::size_t nr = n >= 1 && n <= 4 ? 2 * std::size_t(n) : 0;
@@ -118,7 +96,7 @@ void fuzz_ynzenr(Input& in) {
   for (std::size_t j = 0; j < nc; ++j) k[j] = (in.byte() & 3) ? in.real() : 0.0;
   a.seal(k, nc);
   double* r = a.out(nr);
-  std::int32_t nroots = fuzz::kSentinelInt, err = fuzz::kSentinelInt;
+  std::int32_t nroots = kSentinelInt, err = kSentinelInt;
   const std::int32_t res = ynzenr(a.i32(n), k, &nroots, r, &err);
   FUZZ_CHECK("ynzenr", res == (err == 0 ? 0 : 1));
   FUZZ_CHECK("ynzenr", one_of(err, {0, 4712, 4718, 4717, 4709}));
@@ -126,15 +104,14 @@ void fuzz_ynzenr(Input& in) {
   else if (n > 4) FUZZ_CHECK("ynzenr", err == 4718 && nroots == n && all_sentinel(r, nr));
   else if (err == 0) FUZZ_CHECK("ynzenr", nroots >= 0 && nroots <= n && none_sentinel(r, 2 * std::size_t(nroots)));
   else if (err == 4717) FUZZ_CHECK("ynzenr", nroots == 1);
-  done("ynzenr", a, c);
+  a.done();
 }
 
 // cor, deriv, dersec, derter: the value for m coefficients; c is not read where documented.
 void fuzz_evaluate(Input& in, int which) {
   static const char* names[4] = {"cor", "deriv", "dersec", "derter"};
   const char* name = names[which];
-  Args a(in);
-  Call c(name);
+  Case a(in, name);
   const std::int32_t m = in.count(1, 24);
   const double* t = a.reals(1);
   const bool read = which == 0 ? m >= 1 : which == 1 ? m >= 2 && m <= 20 : which == 2 ? m >= 1 : m >= 1;
@@ -150,21 +127,20 @@ void fuzz_evaluate(Input& in, int which) {
   if (which == 0 && read) {  // Horner from the highest coefficient, s starting at 0
     double s = 0.0;
     for (std::int32_t j = m - 1; j >= 0; --j) s = s * *t + k[j];
-    FUZZ_CHECK("cor", same(r, s) || (std::isnan(r) && std::isnan(s)));
+    FUZZ_CHECK("cor", alike(r, s));
   }
-  done(name, a, c);
+  a.done();
 }
 
 void fuzz_bernst(Input& in) {
-  Args a(in);
-  Call c("bernst");
+  Case a(in, "bernst");
   const std::int32_t i = in.count(0, 19), n = in.count(0, 19);
   const double* t = a.reals(1);
   const double r = bernst(&i, &n, t);
   if (i <= 0 && n <= 0) FUZZ_CHECK("bernst", same(r, 1.0));
   else if (!(0 <= i && i <= n && n <= 19)) FUZZ_CHECK("bernst", same(r, 0.0));
   else if (*t == 0) FUZZ_CHECK("bernst", r == (i == 0 ? 1.0 : 0.0));
-  done("bernst", a, c);
+  a.done();
 }
 
 // ---- Quadrature -------------------------------------------------------------------------
@@ -206,14 +182,13 @@ double f1(const double*) { return next_value(*t_integrand); }
 double f2(const double*, const double*) { return next_value(*t_integrand); }
 
 void fuzz_quadrature(Input& in, int which) {
-  Args a(in);
+  const char* name = which == 0 ? "gauleg" : "dauleg";
+  Case a(in, name);
   Integrand g;
   for (int k = in.pick(1, 6); k > 0; --k) g.values.push_back(in.real());
   g.nest = (in.byte() & 3) == 0;
   g.inner_n = in.count(1, 20);
   t_integrand = &g;
-  const char* name = which == 0 ? "gauleg" : "dauleg";
-  Call c(name);
   const double *lo = a.reals(1), *hi = a.reals(1);
   long want;
   if (which == 0) {
@@ -229,7 +204,7 @@ void fuzz_quadrature(Input& in, int which) {
   FUZZ_CHECK(name, g.calls == want);
   if (g.nest) FUZZ_CHECK(name, g.inner_calls == ((want + 3) / 4) * rule_points(g.inner_n));
   t_integrand = nullptr;
-  done(name, a, c);
+  a.done();
 }
 
 }  // namespace
@@ -247,3 +222,5 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
   else fuzz_quadrature(in, in.byte() & 1);
   return 0;
 }
+
+}  // namespace fuzz

@@ -3,6 +3,7 @@
 // public headers give (codes, untouched outputs, unmodified inputs, no traceback frame,
 // workspace released).
 #pragma once
+#include <algorithm>
 #include <cfloat>
 #include <cmath>
 #include <cstddef>
@@ -10,6 +11,7 @@
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
+#include <functional>
 #include <initializer_list>
 #include <limits>
 #include <memory>
@@ -49,6 +51,8 @@ inline double from_bits(std::uint64_t u) {
   return x;
 }
 inline bool same(double a, double b) { return bits(a) == bits(b); }
+// The same bits, or both NaN (of any payload).
+inline bool alike(double a, double b) { return same(a, b) || (std::isnan(a) && std::isnan(b)); }
 
 // Pattern written into every output before a call: a signalling NaN payload that no
 // arithmetic produces (arithmetic quiets a signalling NaN) and the decoder never yields.
@@ -63,7 +67,6 @@ constexpr std::int32_t kSentinelInt = -0x5eed0001;
 class Input {
  public:
   Input(const std::uint8_t* data, std::size_t size) : p_(data), n_(size) {}
-  bool empty() const { return n_ == 0; }
   std::uint8_t byte() {
     if (n_ == 0) return 0;
     --n_;
@@ -143,6 +146,13 @@ class Args {
     double* p = alloc(n);
     for (std::size_t k = 0; k < n; ++k) p[k] = in_.real();
     remember(p, n);
+    return p;
+  }
+  // An input array holding v.
+  double* copy_of(const std::vector<double>& v) {
+    double* p = alloc(v.size());
+    std::copy(v.begin(), v.end(), p);
+    remember(p, v.size());
     return p;
   }
   // An input array whose contents the caller fills; remembered by seal().
@@ -243,6 +253,31 @@ inline bool one_of(std::int32_t v, std::initializer_list<std::int32_t> set) {
     if (v == s) return true;
   return false;
 }
+// How many leading entries were written (hold no sentinel).
+inline std::size_t written(const double* p, std::size_t n) {
+  std::size_t k = 0;
+  while (k < n && !is_sentinel(p[k])) ++k;
+  return k;
+}
+// A routine's code: one of its documented set, and the result 1 exactly when it is not 0.
+inline void check_code(const char* routine, std::int32_t res, std::int32_t ierr,
+                       std::initializer_list<std::int32_t> set) {
+  if (!one_of(ierr, set)) broken(routine, "code outside the documented set", ierr);
+  if (res != (ierr ? 1 : 0)) broken(routine, "result does not match the code", res);
+}
+// The call `run_on(buf)` again with the output placed on a copy of one input (n_in reals):
+// the same bits as `want` (n_out reals) must come out, since every input is read before any
+// output is written; where `want` holds the sentinel (not written), the input's value.
+inline void same_when_aliased(const char* routine, const double* in, std::size_t n_in,
+                              const double* want, std::size_t n_out,
+                              const std::function<void(double*)>& run_on) {
+  std::vector<double> buf(in, in + n_in);
+  buf.resize(n_in > n_out ? n_in : n_out);
+  run_on(buf.data());
+  for (std::size_t k = 0; k < n_out; ++k)
+    if (!same(buf[k], is_sentinel(want[k]) && k < n_in ? in[k] : want[k]))
+      broken(routine, "aliased output differs", long(k));
+}
 
 // One traceback frame as recorded on this thread.
 struct Frame {
@@ -289,6 +324,23 @@ class Call {
  private:
   const char* routine_;
   std::int64_t outstanding0_;
+};
+
+// The arguments of one call and its bracket: done() checks that the inputs are unmodified
+// and the call quiet; done_released() only that its workspace was released.
+class Case : public Args {
+ public:
+  Case(Input& in, const char* routine) : Args(in), call(routine), name(routine) {}
+  void done() const {
+    check_inputs(name);
+    call.quiet();
+  }
+  void done_released() const {
+    check_inputs(name);
+    call.released();
+  }
+  Call call;
+  const char* name;
 };
 
 // Sets tolerances of the current set from the input for the life of the object, then puts
